@@ -1,0 +1,8 @@
+list(APPEND MORVEL_APP_LOGIC
+  ${CMAKE_CURRENT_LIST_DIR}/toolconfiguration.cpp)
+list(APPEND MORVEL_APP_DIALOG
+  ${CMAKE_CURRENT_LIST_DIR}/import.h
+  ${CMAKE_CURRENT_LIST_DIR}/import.cpp
+  ${CMAKE_CURRENT_LIST_DIR}/readtoolconfiguration.cpp
+  ${CMAKE_CURRENT_LIST_DIR}/about.cpp
+  ${CMAKE_CURRENT_LIST_DIR}/logstyle.h)
