@@ -1,3 +1,5 @@
 list(APPEND MORVEL_RUN_LOGIC)
 list(APPEND MORVEL_RUN_DIALOG
+  ${CMAKE_CURRENT_LIST_DIR}/resultdisplay.h
+  ${CMAKE_CURRENT_LIST_DIR}/resultdisplay.cpp
   ${CMAKE_CURRENT_LIST_DIR}/runstubs.cpp)
