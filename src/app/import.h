@@ -66,6 +66,12 @@ public:
     int printType = 0;
     bool importError = false;
     QList<OxidationEntry> oxidationTable;
+
+    // --- Job run: state tracking of the two child programs (src/run) ---
+private:
+    bool programRuns() const;
+    void updateRunButtons();
+    void startChild(QProcess *process, const QString &program, const QStringList &arguments);
 };
 
 #endif
