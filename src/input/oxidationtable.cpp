@@ -1,0 +1,109 @@
+#include "oxidationtable.h"
+#include "linereader.h"
+#include "logstyle.h"
+
+namespace {
+const float notFound = 1000.0f;
+
+// Fields of a reduced line: runs of blanks and commas separate, empty parts are skipped.
+QStringList tableFields(const QString &reduced)
+{
+    QStringList fields;
+    qsizetype start = 0;
+    for (qsizetype i = 0; i <= reduced.size(); ++i) {
+        if (i == reduced.size() || reduced.at(i) == QLatin1Char(' ') || reduced.at(i) == QLatin1Char(',')) {
+            if (i > start)
+                fields.append(reduced.mid(start, i - start));
+            start = i + 1;
+        }
+    }
+    return fields;
+}
+} // namespace
+
+QString formatCharge(float charge)
+{
+    return QString::number(double(charge), 'g', 6);
+}
+
+QString echoLine(const OxidationEntry &entry)
+{
+    return entry.name + QLatin1String("  ") + entry.symbol + QLatin1String("  ") + formatCharge(entry.charge);
+}
+
+OxidationTableRead parseOxidationTable(const QString &text)
+{
+    OxidationTableRead read;
+    LineReader in(text);
+    // The end test follows each line, so an empty text still gives one (empty, invalid) line.
+    do {
+        const QString reduced = in.readLine().simplified().trimmed();
+        const QStringList fields = tableFields(reduced);
+        const qsizetype n = fields.size();
+        if (n < 3) {
+            read.log.append(LogStyle::error(QStringLiteral(" Invalid line in \"oxidation.dat\" file! ")));
+            read.log.append(reduced);
+            read.log.append(QStringLiteral("<b> should be of type :  atom_names atom_symbol atom_charge </b><br>"));
+            return read;
+        }
+        const QString &symbol = fields.at(n - 2);
+        const float charge = fields.at(n - 1).toFloat();
+        for (qsizetype i = 0; i < n - 2; ++i)
+            read.entries.append(OxidationEntry{fields.at(i), symbol, charge});
+    } while (!in.atEnd());
+
+    read.complete = true;
+    read.log.reserve(read.entries.size() + 1);
+    read.log.append(QStringLiteral("<b>Got the following list of atom symbols and charges :  </b>"));
+    for (const OxidationEntry &entry : read.entries)
+        read.log.append(echoLine(entry));
+    return read;
+}
+
+OxidationEntry firstEntryForName(const QList<OxidationEntry> &table, const QString &key)
+{
+    for (const OxidationEntry &entry : table) {
+        if (entry.name.trimmed() == key)
+            return entry;
+    }
+    return OxidationEntry{QString(), QString(), notFound};
+}
+
+float firstChargeForSymbol(const QList<OxidationEntry> &table, const QString &symbol)
+{
+    const QString wanted = symbol.trimmed();
+    for (const OxidationEntry &entry : table) {
+        if (entry.symbol.trimmed() == wanted)
+            return entry.charge;
+    }
+    return notFound;
+}
+
+OxidationIndex::OxidationIndex(const QList<OxidationEntry> &table)
+    : table(table)
+{
+    firstByName.reserve(table.size());
+    firstChargeBySymbol.reserve(table.size());
+    for (qsizetype i = 0; i < table.size(); ++i) {
+        const OxidationEntry &entry = table.at(i);
+        const QString name = entry.name.trimmed();
+        if (!firstByName.contains(name))
+            firstByName.insert(name, i);
+        const QString symbol = entry.symbol.trimmed();
+        if (!firstChargeBySymbol.contains(symbol))
+            firstChargeBySymbol.insert(symbol, entry.charge);
+    }
+}
+
+OxidationEntry OxidationIndex::entryForName(const QString &key) const
+{
+    const auto it = firstByName.constFind(key);
+    if (it == firstByName.constEnd())
+        return OxidationEntry{QString(), QString(), notFound};
+    return table.at(it.value());
+}
+
+float OxidationIndex::chargeForSymbol(const QString &symbol) const
+{
+    return firstChargeBySymbol.value(symbol.trimmed(), notFound);
+}

@@ -1,0 +1,52 @@
+#ifndef MORVEL_OXIDATIONTABLE_H
+#define MORVEL_OXIDATIONTABLE_H
+
+#include "oxidationentry.h"
+
+#include <QHash>
+#include <QList>
+#include <QStringList>
+
+// What was understood from the text of oxidation.dat, and the log lines that tell the user so
+// (everything after the "Found file" line). An invalid line stops the reading: the entries of
+// the lines above it are kept and no echo follows.
+struct OxidationTableRead
+{
+    QList<OxidationEntry> entries;
+    QStringList log;
+    bool complete = false;
+};
+
+OxidationTableRead parseOxidationTable(const QString &text);
+
+// A charge as the log and the job files show it: C locale, 'g' form, six significant digits.
+QString formatCharge(float charge);
+
+// The echo line of one entry: name, symbol and charge, two spaces apart.
+QString echoLine(const OxidationEntry &entry);
+
+// The first entry whose trimmed name equals key (the key itself is not trimmed); the
+// not-found entry (empty name and symbol, charge 1000) when none does.
+OxidationEntry firstEntryForName(const QList<OxidationEntry> &table, const QString &key);
+
+// The charge of the first entry whose trimmed symbol equals the trimmed symbol; 1000 if none.
+float firstChargeForSymbol(const QList<OxidationEntry> &table, const QString &symbol);
+
+// The same two lookups with hash tables, for rewriting files with many atoms: each lookup costs
+// the same whatever the size of the table, and still finds the first entry in table order.
+class OxidationIndex
+{
+public:
+    explicit OxidationIndex(const QList<OxidationEntry> &table);
+
+    OxidationEntry entryForName(const QString &key) const;
+    float chargeForSymbol(const QString &symbol) const;
+    bool isEmpty() const { return table.isEmpty(); }
+
+private:
+    QList<OxidationEntry> table;
+    QHash<QString, qsizetype> firstByName;
+    QHash<QString, float> firstChargeBySymbol;
+};
+
+#endif

@@ -1,0 +1,31 @@
+#include "import.h"
+#include "logstyle.h"
+#include "oxidationtable.h"
+
+#include <QFile>
+
+void Import::readOxidationTable()
+{
+    QFile file(workingDir + QLatin1String("/oxidation.dat"));
+    // Read-write like every file of the program: a missing table is created empty.
+    if (!file.open(QIODevice::ReadWrite)) {
+        importlog->append(LogStyle::error(QStringLiteral(" Cannot open \"oxidation.dat\" file in read-write mode! ")));
+        return;
+    }
+    importlog->append(QStringLiteral("<br><b>Found file \"oxidation.dat\" in working directory : </b>"));
+    // Latin-1 keeps every byte, so names match the CIF labels byte for byte.
+    OxidationTableRead read = parseOxidationTable(QString::fromLatin1(file.readAll()));
+    oxidationTable = std::move(read.entries);
+    for (const QString &line : std::as_const(read.log))
+        importlog->append(line);
+}
+
+OxidationEntry Import::entryForName(const QString &key) const
+{
+    return firstEntryForName(oxidationTable, key);
+}
+
+float Import::chargeForSymbol(const QString &symbol) const
+{
+    return firstChargeForSymbol(oxidationTable, symbol);
+}
