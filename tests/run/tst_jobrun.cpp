@@ -1,0 +1,466 @@
+#include "import.h"
+#include "testsupport.h"
+
+#include <QMessageBox>
+#include <QPushButton>
+#include <QTimer>
+#include <QtTest>
+
+#include <memory>
+
+namespace {
+const QString running = QStringLiteral("<br><b> Running CIF parser tool ...</b><br>");
+const QString starting = QStringLiteral("-->  Starting CIF parser ...");
+const QString done = QStringLiteral("<br><b> DONE !!!  </b><br>");
+const QString morvelStart = QStringLiteral("<br>-->  Starting Morvel ...");
+const QString failure =
+    QStringLiteral("<br><b><font color=#FF3300> Something went wrong with Import procedure ! </font></b><br>");
+const QString morvelFailure =
+    QStringLiteral("<br><b><font color=#FF3300> Something went wrong with morvel program ! </font></b><br>");
+const QString exists =
+    QStringLiteral("<br><b>A \"MORVEL.OUT\" file already exists in the working directory !</b>");
+const QStringList errorSeen = {
+    QStringLiteral("<br><b><font color=#FF3300> Something went wrong with Import procedure ! </font></b>"),
+    QStringLiteral("<b><font color=#FF3300> Please check cifparser.log file.</font></b><br>")};
+const QStringList killed = {QStringLiteral("<b>Killing Import program process</b>"),
+                            QStringLiteral("<b>Killing Morvel program process</b>")};
+
+// What the parameter file writer logs for the start-up form, with "PART" in morvelpartxt.txt.
+QStringList params(int format)
+{
+    return {QStringLiteral("<br><b> Writing morvel.par file: </b><br>"), QStringLiteral("PART"),
+            QStringLiteral(" Job options : "), QStringLiteral(" ------------------- "),
+            QStringLiteral(" DMAX       \t= 4"), QStringLiteral(" TOLERANCE   \t= 10"),
+            QStringLiteral(" THRESH     \t= 3.1"), QStringLiteral(" INPUT      \t= ") + QString::number(format),
+            QStringLiteral(" OUTPUT     \t= 0"), QStringLiteral(" PRINT TYPE \t= 0"),
+            QStringLiteral(" MAX V-ATOMS\t= 11"), QStringLiteral("<br><b> Done.  </b><br>")};
+}
+
+// The spacing and banner above a result, followed by the result's text.
+QStringList result(const QString &text)
+{
+    const QString mid = QString(15, '#') + QString(33, ' ');
+    return {" ", " ", QString(61, '#'), mid, QString(15, '#') + "\t\t" + QString(12, ' ') + "MORVEL.OUT  ",
+            mid, QString(61, '#') + "<br>", text};
+}
+
+// The log as it shows after these appends (as HTML, or as the text the user reads).
+QString shown(const QStringList &appends, bool html = true)
+{
+    QTextEdit ref;
+    for (const QString &a : appends)
+        ref.append(a);
+    return html ? ref.toHtml() : ref.toPlainText();
+}
+
+// The paragraphs of a log's HTML, without the document header.
+QString paragraphs(const QString &html)
+{
+    return html.mid(html.indexOf(QLatin1String("<p ")));
+}
+
+// One dialog whose binaries directory (current directory) and working directory are fresh.
+struct Job
+{
+    CurrentDirScope bin;
+    QString work;
+    std::unique_ptr<Import> dlg;
+
+    explicit Job(const QString &dirName = QStringLiteral("work"))
+    {
+        QDir(bin.path()).mkpath(dirName);
+        work = bin.file(dirName);
+        writeFile(bin.file("morvelpartxt.txt"), "PART");
+        dlg = std::make_unique<Import>();
+        dlg->parserProgram = QStringLiteral("./conv");
+        dlg->morvelProgram = QStringLiteral("./morvel");
+        script("conv", "cp \"$1\" \"$2\"");
+        script("morvel", "cat morvel.in > MORVEL.OUT");
+    }
+    void script(const QString &name, const QByteArray &body) const
+    {
+        writeFile(bin.file(name), "#!/bin/sh\n" + body + "\n");
+        QFile(bin.file(name)).setPermissions(QFileDevice::ExeOwner | QFileDevice::ReadOwner);
+    }
+    void choose(const QString &name, const QByteArray &bytes, int format) const
+    {
+        if (!bytes.isNull())
+            writeFile(work + '/' + name, bytes);
+        dlg->inputFile = work + '/' + name;
+        dlg->workingDir = work;
+        dlg->stagedInputPath = work + "/morvel.in";
+        dlg->InputBox->setCurrentIndex(format);
+    }
+    QByteArray file(const QString &name) const
+    {
+        QFile f(work + '/' + name);
+        return f.open(QIODevice::ReadOnly) ? f.readAll() : QByteArray("<none>");
+    }
+    bool idle() const { return dlg->importButton->isEnabled() && !dlg->killbutton->isEnabled(); }
+    bool busy() const { return !dlg->importButton->isEnabled() && dlg->killbutton->isEnabled(); }
+    QString log() const { return dlg->importlog->toHtml(); }
+    QString text() const { return dlg->importlog->toPlainText(); }
+    bool logEndsWith(const QStringList &appends) const { return log().endsWith(paragraphs(shown(appends))); }
+};
+
+// Answers the next modal message box with the given button and notes what it said.
+void answerBox(QMessageBox::StandardButton answer, QString *seen)
+{
+    QTimer::singleShot(0, [=] {
+        for (QWidget *w : QApplication::topLevelWidgets())
+            if (auto *box = qobject_cast<QMessageBox *>(w); box && box->isVisible()) {
+                *seen = box->windowTitle() + '|' + box->text() + '|' + box->informativeText();
+                box->button(answer)->click();
+            }
+    });
+}
+} // namespace
+
+class TestJobRun : public QObject
+{
+    Q_OBJECT
+
+private slots:
+    void parameterFile_data();
+    void parameterFile();
+    void noInputFile();
+    void suffixQuestion_data();
+    void suffixQuestion();
+    void cifRunLog();
+    void copyPath_data();
+    void copyPath();
+    void converterReportsError();
+    void converterFails_data();
+    void converterFails();
+    void kill_data();
+    void kill();
+    void keptResult_data();
+    void keptResult();
+    void morvelFailsToStart();
+    void resultDisplay_data();
+    void resultDisplay();
+    void editor();
+    void pathsWithSpacesAndQuotes();
+};
+
+void TestJobRun::parameterFile_data()
+{
+    QTest::addColumn<QByteArray>("part"); // null: no morvelpartxt.txt
+    QTest::addColumn<bool>("parBlocked");
+    QTest::addColumn<QByteArray>("file");
+    QTest::addColumn<QStringList>("log");
+    const QByteArray line = "   4          0   0   0   0    10   1.6 3.1   11 .001 0.5\n";
+    QStringList withText = params(0);
+    withText[1] = "two\r\nlines";
+    QTest::newRow("part text kept as is") << QByteArray("two\r\nlines") << false
+                                          << line + " two\r\nlines\n" << withText;
+    withText[1] = "";
+    QTest::newRow("empty part file") << QByteArray("") << false << line + " \n" << withText;
+    withText[1] = "<br><b><font color=#FF3300> Something went wrong while opening \"morvelpartxt.txt\" file! "
+                  "</font></b><br>";
+    QTest::newRow("no part file") << QByteArray() << false << line << withText;
+    QTest::newRow("parameter file blocked")
+        << QByteArray("PART") << true << QByteArray("<none>")
+        << QStringList{params(0).first(), "<br><b><font color=#FF3300> Something went wrong while opening a "
+                                          "new \"morvel.par\" file! </font></b><br>"};
+}
+
+void TestJobRun::parameterFile()
+{
+    QFETCH(QByteArray, part);
+    QFETCH(bool, parBlocked);
+    Job job;
+    QFile::remove(job.bin.file("morvelpartxt.txt"));
+    if (!part.isNull())
+        writeFile(job.bin.file("morvelpartxt.txt"), part);
+    if (parBlocked)
+        QDir(job.work).mkdir("morvel.par");
+    else // an earlier, longer file must leave nothing behind
+        writeFile(job.work + "/morvel.par", QByteArray(500, 'x'));
+    job.choose("a.cif", "data", 0);
+    job.dlg->importlog->clear();
+    job.dlg->writeParameterFile();
+    QTEST(job.file("morvel.par"), "file");
+    QFETCH(QStringList, log);
+    QCOMPARE(job.log(), shown(log));
+}
+
+void TestJobRun::noInputFile()
+{
+    Job job;
+    Import fresh; // the same start-up report
+    fresh.importlog->append(
+        "<br><b><font color=#FF3300> Please set Input file before starting ! </font></b><br>");
+    job.dlg->importButton->click();
+    QCOMPARE(job.log(), fresh.importlog->toHtml());
+    QVERIFY(job.idle());
+}
+
+void TestJobRun::suffixQuestion_data()
+{
+    QTest::addColumn<QString>("name");
+    QTest::addColumn<int>("answer");
+    QTest::addColumn<bool>("asked");
+    QTest::newRow("x.txt, Cancel") << "x.txt" << int(QMessageBox::Cancel) << true;
+    QTest::newRow("x.cif.txt, Yes") << "x.cif.txt" << int(QMessageBox::Yes) << true;
+    QTest::newRow("X.CIF, no question") << "X.CIF" << int(QMessageBox::Cancel) << false;
+}
+
+void TestJobRun::suffixQuestion()
+{
+    QFETCH(QString, name);
+    QFETCH(int, answer);
+    QFETCH(bool, asked);
+    Job job;
+    job.choose(name, "data", 0);
+    QString seen;
+    answerBox(QMessageBox::StandardButton(answer), &seen);
+    job.dlg->importButton->click();
+    if (asked)
+        QCOMPARE(seen, QStringLiteral("WARNING!|The selected file does not have the \".cif\" suffix !|Continue anyway?"));
+    if (asked && answer == QMessageBox::Cancel) {
+        QCOMPARE(job.log(), shown(params(0)));
+        QVERIFY(job.idle());
+        QCOMPARE(job.dlg->importProcess->state(), QProcess::NotRunning);
+        return;
+    }
+    QTRY_VERIFY(job.idle());
+    QTRY_COMPARE(job.file("MORVEL.OUT"), QByteArray("data"));
+    QVERIFY(seen.isEmpty() == !asked);
+}
+
+void TestJobRun::cifRunLog()
+{
+    Job job;
+    job.choose("in.cif", "DATA 1\nDATA 2", 0);
+    writeFile(job.work + "/MORVEL.OUT", "earlier");
+    job.dlg->importButton->click();
+    QVERIFY(job.busy());
+    QTRY_VERIFY(job.idle());
+    const QString command = QString("\"./conv\" \"%1/in.cif\" \"%1/morvel.in\"").arg(job.work);
+    const QStringList head = params(0) + QStringList{running, starting, command, done, exists,
+                                                     "<b>It has been renamed as :</b>  /MORVEL.OUT.old1", morvelStart};
+    QCOMPARE(job.text(), shown(head + result("DATA 1\nDATA 2"), false));
+    QVERIFY(job.log().startsWith(shown(head).section("</body>", 0, 0)));
+    QCOMPARE(job.file("MORVEL.OUT.old1"), QByteArray("earlier"));
+}
+
+void TestJobRun::copyPath_data()
+{
+    QTest::addColumn<QString>("name");
+    QTest::addColumn<QByteArray>("bytes"); // null: the chosen file has vanished
+    QTest::addColumn<QByteArray>("staged");
+    QTest::addColumn<QStringList>("lines");
+    const QString copying = "<br><b>  Copying input file as \"morvel.in\" file </b>";
+    QByteArray all("A\r\nB\r\n");
+    for (int b = 0; b < 256; ++b)
+        all += char(b);
+    QTest::newRow("shorter than earlier") << "a.txt" << QByteArray("short\n") << QByteArray("short\n")
+                                          << QStringList{copying};
+    QTest::newRow("CR LF and every byte") << "a.txt" << all << all << QStringList{copying};
+    QTest::newRow("empty") << "a.txt" << QByteArray("") << QByteArray("") << QStringList{copying};
+    QTest::newRow("vanished source") << "gone.txt" << QByteArray() << QByteArray("")
+        << QStringList{copying, "<br><b><font color=#FF3300> Something went wrong while opening input file! "
+                                "</font></b><br>", "argument was %1/gone.txt"};
+    QTest::newRow("the staged file itself") << "morvel.in" << QByteArray("self") << QByteArray("self")
+                                            << QStringList{"<br><b> Input as \"morvel.in\" file </b>"};
+    QTest::newRow("Morvel.In is another file here") << "Morvel.In" << QByteArray("other")
+                                                    << QByteArray("other") << QStringList{copying};
+}
+
+void TestJobRun::copyPath()
+{
+    QFETCH(QString, name);
+    QFETCH(QByteArray, bytes);
+    QFETCH(QStringList, lines);
+    Job job;
+    job.script("morvel", "cat morvel.in > MORVEL.OUT; exec sleep 0.3");
+    if (name != "morvel.in")
+        writeFile(job.work + "/morvel.in", "a much longer earlier input file\n");
+    job.choose(name, bytes, 2);
+    job.dlg->importButton->click();
+    QVERIFY(job.busy()); // fault 1: nothing may start a run while MORVEL runs
+    QTRY_VERIFY(job.idle());
+    QTEST(job.file("morvel.in"), "staged");
+    QTEST(job.file("MORVEL.OUT"), "staged");
+    QVERIFY(QFile::exists(job.work + '/' + name) == !bytes.isNull());
+    lines.replaceInStrings("%1", job.work);
+    const QString head = shown(params(2) + lines + QStringList{done, morvelStart}).section("</body>", 0, 0);
+    QVERIFY2(job.log().startsWith(head), qPrintable(job.text()));
+}
+
+void TestJobRun::converterReportsError()
+{
+    Job job;
+    job.script("conv", "echo NO ERRORS; while [ ! -e go ]; do sleep 0.02; done\n"
+                       "echo ERROR; while [ ! -e stop ]; do sleep 0.02; done");
+    job.choose("in.cif", "data", 0);
+    job.dlg->importButton->click();
+    const QString command = QString("\"./conv\" \"%1/in.cif\" \"%1/morvel.in\"").arg(job.work);
+    const QStringList head = params(0) + QStringList{running, starting, command};
+    QTRY_COMPARE(job.log(), shown(head + errorSeen));
+    QVERIFY(job.busy()); // the converter still runs
+    writeFile(job.work + "/go", "");
+    QTRY_COMPARE(job.log(), shown(head + errorSeen + errorSeen));
+    writeFile(job.work + "/stop", "");
+    QTRY_VERIFY(job.idle());
+    QCOMPARE(job.log(), shown(head + errorSeen + errorSeen));
+    QVERIFY(!QFile::exists(job.work + "/MORVEL.OUT"));
+}
+
+void TestJobRun::converterFails_data()
+{
+    QTest::addColumn<QByteArray>("body"); // null: the converter is missing
+    QTest::addColumn<QStringList>("lines");
+    const QString command = "\"./conv\" \"%1/in.cif\" \"%1/morvel.in\"";
+    QTest::newRow("exit 2") << QByteArray("exit 2") << QStringList{running, starting, command, failure};
+    QTest::newRow("cannot start") << QByteArray()
+                                  << QStringList{running, " error occured : 0", failure, command};
+    QTest::newRow("killed by a signal") << QByteArray("kill -KILL $$")
+        << QStringList{running, starting, command, " error occured : 1", failure, failure};
+}
+
+void TestJobRun::converterFails()
+{
+    QFETCH(QByteArray, body);
+    QFETCH(QStringList, lines);
+    Job job;
+    QFile::remove(job.bin.file("conv"));
+    if (!body.isNull())
+        job.script("conv", body);
+    job.choose("in.cif", "data", 0);
+    job.dlg->importButton->click();
+    lines.replaceInStrings("%1", job.work);
+    QTRY_COMPARE(job.log(), shown(params(0) + lines));
+    QTRY_VERIFY(job.idle());
+    QTest::qWait(50);
+    QCOMPARE(job.log(), shown(params(0) + lines));
+    QVERIFY(!QFile::exists(job.work + "/MORVEL.OUT"));
+}
+
+void TestJobRun::kill_data()
+{
+    QTest::addColumn<int>("format");
+    QTest::addColumn<QStringList>("tail");
+    QTest::newRow("converter") << 0 << killed + QStringList{" error occured : 1", failure, failure};
+    QTest::newRow("MORVEL") << 1 << killed + QStringList{morvelFailure} + result("");
+}
+
+void TestJobRun::kill()
+{
+    QFETCH(int, format);
+    QFETCH(QStringList, tail);
+    Job job;
+    job.script(format == 0 ? "conv" : "morvel", "exec sleep 30");
+    job.choose("in.cif", "data", format);
+    job.dlg->importButton->click();
+    QVERIFY(job.busy());
+    job.dlg->killbutton->click();
+    QTRY_VERIFY(job.idle());
+    QTRY_VERIFY(job.text().endsWith(shown(tail, false)));
+    QCOMPARE(job.dlg->morvelProcess->state(), QProcess::NotRunning);
+    job.dlg->killImport(); // with nothing running: both lines, still idle
+    QVERIFY(job.logEndsWith(killed));
+    QVERIFY(job.idle());
+}
+
+void TestJobRun::keptResult_data()
+{
+    QTest::addColumn<int>("taken");
+    QTest::addColumn<QString>("line");
+    QTest::newRow("old1 and old2 taken") << 2 << "<b>It has been renamed as :</b>  /MORVEL.OUT.old3";
+    QTest::newRow("all 100 taken") << 100 << "<br><b><font color=#FF3300> The earlier \"MORVEL.OUT\" could not be "
+        "renamed as \"MORVEL.OUT.old1\" to \"MORVEL.OUT.old100\": MORVEL has not been started ! </font></b><br>";
+}
+
+void TestJobRun::keptResult()
+{
+    QFETCH(int, taken);
+    QFETCH(QString, line);
+    Job job;
+    for (int n = 1; n <= taken; ++n)
+        writeFile(job.work + "/MORVEL.OUT.old" + QString::number(n), QByteArray::number(n));
+    writeFile(job.work + "/MORVEL.OUT", "earlier");
+    job.choose("a.txt", "new", 1);
+    job.dlg->importButton->click();
+    QTRY_VERIFY(job.idle());
+    QVERIFY(job.log().contains(paragraphs(shown({done, exists, line})).section("</body>", 0, 0)));
+    QCOMPARE(job.file("MORVEL.OUT.old2"), QByteArray("2"));
+    QCOMPARE(job.file("MORVEL.OUT.old3"), QByteArray(taken == 2 ? "earlier" : "3"));
+    QCOMPARE(job.file("MORVEL.OUT"), QByteArray(taken == 2 ? "new" : "earlier"));
+}
+
+void TestJobRun::morvelFailsToStart()
+{
+    Job job;
+    job.dlg->morvelProgram = "./missing";
+    writeFile(job.work + "/MORVEL.OUT", "earlier");
+    job.choose("a.txt", "new", 1);
+    job.dlg->importButton->click();
+    QVERIFY(job.idle());
+    QVERIFY(job.logEndsWith(QStringList{morvelFailure} + result("")));
+    QCOMPARE(job.file("MORVEL.OUT"), QByteArray(""));
+    QCOMPARE(job.file("MORVEL.OUT.old1"), QByteArray("earlier"));
+}
+
+void TestJobRun::resultDisplay_data()
+{
+    QTest::addColumn<QByteArray>("text");
+    QTest::addColumn<int>("code");
+    QTest::newRow("plain") << QByteArray("line 1\n    line 2  \n") << 0;
+    QTest::newRow("rich with TITLE, exit 3")
+        << QByteArray("<html><body><p>head   er</p><a name=\"TITLE\">Title</a><p>rest</p></body></html>") << 3;
+}
+
+void TestJobRun::resultDisplay()
+{
+    QFETCH(QByteArray, text);
+    QFETCH(int, code);
+    Job job;
+    writeFile(job.bin.file("result"), text);
+    job.script("morvel", "cat '" + job.bin.file("result").toUtf8() + "' > MORVEL.OUT; exit " + QByteArray::number(code));
+    job.choose("a.txt", "x", 1);
+    job.dlg->importButton->click();
+    QTRY_VERIFY(job.idle());
+    const QStringList tail = (code ? QStringList{morvelFailure} : QStringList()) + result(QString::fromUtf8(text));
+    QTRY_VERIFY(job.text().endsWith(shown(QStringList{morvelStart} + tail, false)));
+}
+
+void TestJobRun::editor()
+{
+    Job job;
+    job.script("xdg-open", "printf '%s\\n' \"$@\" >> '" + job.bin.file("args").toUtf8() + "'");
+    qputenv("PATH", job.bin.path().toUtf8() + ':' + qgetenv("PATH"));
+    job.choose("a.txt", "x", 1);
+    job.dlg->openButton->click();
+    QVERIFY(job.logEndsWith({"<br><b><font color=#FF3300> There is no MORVEL.OUT file in the current "
+                             "directory! </font></b><br>"}));
+    writeFile(job.work + "/MORVEL.OUT", "r");
+    job.dlg->openButton->click();
+    job.dlg->openButton->click();
+    const QByteArray arg = job.work.toUtf8() + "/MORVEL.OUT\n";
+    QTRY_COMPARE(QFile(job.bin.file("args")).size(), qint64(2 * arg.size()));
+    QFile args(job.bin.file("args"));
+    QVERIFY(args.open(QIODevice::ReadOnly));
+    QCOMPARE(args.readAll(), arg + arg);
+}
+
+void TestJobRun::pathsWithSpacesAndQuotes()
+{
+    Job job("job \"one\" dir");
+    QDir(job.bin.path()).mkdir("my tools");
+    job.script("my tools/conv \"x\"", "printf '%s\\n' \"$@\" > args; cp \"$1\" \"$2\"");
+    job.script("my tools/mor vel", "cat morvel.in > MORVEL.OUT");
+    job.dlg->parserProgram = "./my tools/conv \"x\"";
+    job.dlg->morvelProgram = "./my tools/mor vel";
+    job.choose("in put.cif", "spaced", 0);
+    job.dlg->importButton->click();
+    QTRY_VERIFY(job.idle());
+    QCOMPARE(job.file("args"), (job.work + "/in put.cif\n" + job.work + "/morvel.in\n").toUtf8());
+    QCOMPARE(job.file("MORVEL.OUT"), QByteArray("spaced"));
+    QVERIFY(job.text().contains(
+        QString("\"./my tools/conv \"x\"\" \"%1/in put.cif\" \"%1/morvel.in\"").arg(job.work)));
+}
+
+QTEST_MAIN(TestJobRun)
+#include "tst_jobrun.moc"
