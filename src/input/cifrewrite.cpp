@@ -2,7 +2,7 @@
 #include "linereader.h"
 #include "logstyle.h"
 
-#include <QSet>
+#include "stringindex.h"
 
 namespace {
 // A tag compared the way the rewriting compares them: white space folded and trimmed.
@@ -82,7 +82,7 @@ AtomRowRewrite rewriteAtomRows(const QStringList &atomRows, const OxidationIndex
     r.rows.reserve(atomRows.size());
     r.log.reserve(atomRows.size() + 1);
     r.log.append(QStringLiteral("<br><b> Now identifying pairs atom symbol/atom names : </b>"));
-    QSet<QString> known;
+    StringIndex known;
 
     for (const QString &row : atomRows) {
         QStringList fields = rowFields(row);
@@ -103,10 +103,8 @@ AtomRowRewrite rewriteAtomRows(const QStringList &atomRows, const OxidationIndex
                      + QLatin1String(" and charge ") + formatCharge(entry.charge));
         fields[1] = entry.symbol;
         r.rows.append(fields.join(QLatin1Char(' ')));
-        if (!known.contains(entry.symbol)) {
-            known.insert(entry.symbol);
+        if (known.insert(entry.symbol, 0))
             r.symbols.append(entry.symbol);
-        }
     }
 
     if (!r.unmatchedLabels.isEmpty()) {

@@ -83,27 +83,22 @@ OxidationIndex::OxidationIndex(const QList<OxidationEntry> &table)
     : table(table)
 {
     firstByName.reserve(table.size());
-    firstChargeBySymbol.reserve(table.size());
+    firstBySymbol.reserve(table.size());
+    // insert keeps the value already there: the first entry in table order wins.
     for (qsizetype i = 0; i < table.size(); ++i) {
-        const OxidationEntry &entry = table.at(i);
-        const QString name = entry.name.trimmed();
-        if (!firstByName.contains(name))
-            firstByName.insert(name, i);
-        const QString symbol = entry.symbol.trimmed();
-        if (!firstChargeBySymbol.contains(symbol))
-            firstChargeBySymbol.insert(symbol, entry.charge);
+        firstByName.insert(table.at(i).name.trimmed(), i);
+        firstBySymbol.insert(table.at(i).symbol.trimmed(), i);
     }
 }
 
 OxidationEntry OxidationIndex::entryForName(const QString &key) const
 {
-    const auto it = firstByName.constFind(key);
-    if (it == firstByName.constEnd())
-        return OxidationEntry{QString(), QString(), notFound};
-    return table.at(it.value());
+    const qsizetype i = firstByName.value(key);
+    return i < 0 ? OxidationEntry{QString(), QString(), notFound} : table.at(i);
 }
 
 float OxidationIndex::chargeForSymbol(const QString &symbol) const
 {
-    return firstChargeBySymbol.value(symbol.trimmed(), notFound);
+    const qsizetype i = firstBySymbol.value(symbol.trimmed());
+    return i < 0 ? notFound : table.at(i).charge;
 }

@@ -2,8 +2,8 @@
 #define MORVEL_OXIDATIONTABLE_H
 
 #include "oxidationentry.h"
+#include "stringindex.h"
 
-#include <QHash>
 #include <QList>
 #include <QStringList>
 
@@ -45,8 +45,8 @@ public:
 
 private:
     QList<OxidationEntry> table;
-    QHash<QString, qsizetype> firstByName;
-    QHash<QString, float> firstChargeBySymbol;
+    StringIndex firstByName;   // trimmed name -> table position
+    StringIndex firstBySymbol; // trimmed symbol -> table position
 };
 
 #endif

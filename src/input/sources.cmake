@@ -1,5 +1,7 @@
 list(APPEND MORVEL_INPUT_LOGIC
   ${CMAKE_CURRENT_LIST_DIR}/linereader.h
+  ${CMAKE_CURRENT_LIST_DIR}/stringindex.h
+  ${CMAKE_CURRENT_LIST_DIR}/stringindex.cpp
   ${CMAKE_CURRENT_LIST_DIR}/oxidationtable.h
   ${CMAKE_CURRENT_LIST_DIR}/oxidationtable.cpp
   ${CMAKE_CURRENT_LIST_DIR}/cifrewrite.h

@@ -5,7 +5,7 @@
 #include <QStringList>
 #include <QTextEdit>
 
-// The log as the user reads it: one entry per non-empty line, blanks around it removed.
+// The log as the user reads it: its non-empty lines, trimmed.
 inline QStringList shownLines(const QTextEdit *log)
 {
     QStringList lines;
@@ -19,47 +19,16 @@ inline QStringList shownLines(const QTextEdit *log)
 inline QByteArray fileBytes(const QString &path)
 {
     QFile f(path);
-    if (!f.open(QIODevice::ReadOnly))
-        return QByteArray("<unreadable>");
-    return f.readAll();
+    return f.open(QIODevice::ReadOnly) ? f.readAll() : QByteArray("<unreadable>");
 }
 
-// The worked example: a table of two atoms and a CIF file with a third atom it does not know.
-inline QByteArray exampleTable()
-{
-    return "Fe1 Fe3+ 3\nO1 O2- -2\n";
-}
-
-inline QByteArray exampleCif()
-{
-    return "data_x\n"
-           "loop_\n"
-           "_atom_site_label\n"
-           "_atom_site_type_symbol\n"
-           "_atom_site_fract_x\n"
-           "Fe1   Fe  0.0 0.0 0.0\n"
-           "O1    O   0.5 0.5 0.5\n"
-           "Xx1   Xx  0.1 0.1 0.1\n"
-           "loop_\n"
-           "_atom_site_aniso_label\n";
-}
-
-inline QByteArray exampleRewritten()
-{
-    return "data_x\n"
-           "loop_\n"
-           "_atom_site_label\n"
-           "_atom_site_type_symbol\n"
-           "_atom_site_fract_x\n"
-           "Fe1 Fe3+ 0.0 0.0 0.0\n"
-           "O1 O2- 0.5 0.5 0.5\n"
-           "loop_\n"
-           "_atom_type_symbol\n"
-           "_atom_type_oxidation_number\n"
-           "Fe3+ 3\n"
-           "O2- -2\n"
-           "loop_\n"
-           "_atom_site_aniso_label\n";
-}
+// The worked example: a table of two atoms, a CIF file with a third atom the table does not know.
+const QByteArray exampleTable = "Fe1 Fe3+ 3\nO1 O2- -2\n";
+const QByteArray exampleHead = "data_x\nloop_\n_atom_site_label\n_atom_site_type_symbol\n_atom_site_fract_x\n";
+const QByteArray exampleCif = exampleHead
+    + "Fe1   Fe  0.0 0.0 0.0\nO1    O   0.5 0.5 0.5\nXx1   Xx  0.1 0.1 0.1\nloop_\n_atom_site_aniso_label\n";
+const QByteArray exampleRewritten = exampleHead
+    + "Fe1 Fe3+ 0.0 0.0 0.0\nO1 O2- 0.5 0.5 0.5\nloop_\n_atom_type_symbol\n_atom_type_oxidation_number\n"
+      "Fe3+ 3\nO2- -2\nloop_\n_atom_site_aniso_label\n";
 
 #endif

@@ -3,7 +3,6 @@
 
 #include <QApplication>
 #include <QFileDialog>
-#include <QList>
 #include <QMessageBox>
 #include <QPointer>
 #include <QPushButton>
@@ -11,72 +10,53 @@
 
 #include <functional>
 
-// What a message box showed to the user.
-struct SeenBox
-{
-    QString title;
-    QString text;
-    QString informativeText;
-    QMessageBox::Icon icon = QMessageBox::NoIcon;
-    QMessageBox::StandardButtons buttons;
-    QMessageBox::StandardButton defaultButton = QMessageBox::NoButton;
-};
-
 // Plays the user's part in the modal windows a slot opens: each expected window, in order, is
-// answered by one step. The windows run nested event loops, so a timer looks for them there.
+// answered by one step. They run nested event loops, so a timer looks for them from there.
 class ModalDriver : public QObject
 {
 public:
     ModalDriver()
     {
-        timer.setInterval(5);
         connect(&timer, &QTimer::timeout, this, &ModalDriver::poll);
-        timer.start();
+        timer.start(5);
     }
 
-    // Answers the next file dialog by choosing path, or by cancelling when path is empty.
+    // The next file dialog: choose path, or cancel when path is empty.
     void chooseFile(const QString &path)
     {
         steps.append([this, path](QWidget *w) {
             auto *dialog = qobject_cast<QFileDialog *>(w);
             if (!dialog)
                 return unexpected(w);
-            dialogDirectories.append(dialog->directory().absolutePath());
-            dialogCaptions.append(dialog->windowTitle());
-            dialogFilters.append(dialog->nameFilters());
-            if (path.isEmpty()) {
-                dialog->reject();
-            } else {
-                dialog->selectFile(path);
-                static_cast<QDialog *>(dialog)->accept(); // public in QDialog, runs QFileDialog::accept
-            }
+            seen.append(dialog->windowTitle() + " | " + dialog->nameFilters().join(";;") + " | "
+                        + dialog->directory().absolutePath());
+            if (path.isEmpty())
+                return dialog->reject();
+            dialog->selectFile(path);
+            static_cast<QDialog *>(dialog)->accept(); // public in QDialog, runs QFileDialog::accept
         });
     }
 
-    // Answers the next message box with button, after running before (if given).
+    // The next message box: run before (if any), then press button.
     void answerBox(QMessageBox::StandardButton button, std::function<void()> before = {})
     {
         steps.append([this, button, before](QWidget *w) {
             auto *box = qobject_cast<QMessageBox *>(w);
-            if (!box)
+            if (!box || !box->button(button))
                 return unexpected(w);
-            boxes.append(SeenBox{box->windowTitle(), box->text(), box->informativeText(), box->icon(),
-                                 box->standardButtons(), box->standardButton(box->defaultButton())});
+            seen.append(QStringList{box->windowTitle(), QString::number(box->icon()), box->text(), box->informativeText(),
+                                    QString::number(box->standardButtons()),
+                                    QString::number(box->standardButton(box->defaultButton()))}
+                            .join(" | "));
             if (before)
                 before();
-            if (QAbstractButton *b = box->button(button))
-                b->click();
-            else
-                unexpected(w);
+            box->button(button)->click();
         });
     }
 
-    bool allAnswered() const { return steps.isEmpty(); }
+    bool allAnswered() const { return steps.isEmpty() && problems.isEmpty(); }
 
-    QList<SeenBox> boxes;
-    QStringList dialogDirectories;
-    QStringList dialogCaptions;
-    QList<QStringList> dialogFilters;
+    QStringList seen; // one line per window, in order
     QStringList problems;
 
 private:
@@ -88,18 +68,14 @@ private:
         handled = w;
         if (steps.isEmpty())
             return unexpected(w);
-        const auto step = steps.takeFirst();
-        step(w);
+        steps.takeFirst()(w);
     }
 
     void unexpected(QWidget *w)
     {
-        problems.append(QStringLiteral("unexpected window ") + QLatin1String(w->metaObject()->className()) + QLatin1Char(' ')
-                        + w->windowTitle());
+        problems.append(QLatin1String("unexpected ") + w->metaObject()->className());
         if (auto *dialog = qobject_cast<QDialog *>(w))
             dialog->reject();
-        else
-            w->close();
     }
 
     QTimer timer;
