@@ -1,18 +1,435 @@
 #include "resultdisplay.h"
+#include "resultdisplaytext.h"
 
+#include <QAbstractTextDocumentLayout>
+#include <QCoreApplication>
+#include <QElapsedTimer>
 #include <QFile>
+#include <QFontMetricsF>
+#include <QPointer>
+#include <QScrollBar>
+#include <QTextBlock>
+#include <QTextCursor>
+#include <QTextDocument>
 #include <QTextEdit>
-#include <QTextStream>
+#include <QTextFrame>
+#include <QThread>
+#include <QTimer>
+
+#include <algorithm>
+
+using namespace ResultText;
+
+namespace {
+
+const QString titleAnchor = QStringLiteral("TITLE");
+
+// The result file's first bytes and what is known of the rest.
+struct ResultSource
+{
+    QString path;
+    qint64 fileSize = 0;
+    QByteArray bytes;
+    bool complete = true; // bytes hold the whole file
+};
+
+// The formats a new paragraph of the log gets: those of the editor's cursor, as in its append.
+struct AppendFormats
+{
+    QTextBlockFormat block;
+    QTextCharFormat chars;
+};
+
+// Where the view goes after the append: QTextEdit keeps a read-only log at its bottom when it was
+// there, an editable one when its cursor was at the end.
+bool logAtBottom(QTextEdit *log)
+{
+    const QScrollBar *bar = log->verticalScrollBar();
+    return log->isReadOnly() ? bar->value() >= bar->maximum() : log->textCursor().atEnd();
+}
+
+LogGeometry geometryOf(QTextEdit *log)
+{
+    const QTextDocument *doc = log->document();
+    const QFontMetricsF metrics(doc->defaultFont());
+    LogGeometry geometry;
+    geometry.averageCharWidth = std::max(1.0, metrics.averageCharWidth());
+    geometry.lineHeight = std::max(1.0, metrics.lineSpacing());
+    double width = doc->pageSize().width();
+    if (width < 0)
+        width = log->viewport()->width();
+    if (width > 0)
+        width = std::max(geometry.averageCharWidth, width - 2 * doc->documentMargin());
+    geometry.textWidth = width;
+    return geometry;
+}
+
+// One entry appended the way QTextEdit::append does it: in one edit block, a new paragraph with
+// the editor's formats unless the document is empty, then the text as HTML or as plain text.
+int beginAppend(QTextCursor &cursor, const AppendFormats &formats)
+{
+    QTextDocument *doc = cursor.document();
+    cursor.movePosition(QTextCursor::End);
+    if (!doc->isEmpty())
+        cursor.insertBlock(formats.block, formats.chars);
+    else
+        cursor.setCharFormat(formats.chars);
+    return cursor.position();
+}
+
+void appendHtml(QTextDocument *doc, const AppendFormats &formats, const QString &html)
+{
+    QTextCursor cursor(doc);
+    cursor.beginEditBlock();
+    beginAppend(cursor, formats);
+    cursor.insertHtml(html);
+    cursor.endEditBlock();
+}
+
+// Where a rich text from `start` on has to end for the log to lay it out in time: the position
+// of the first paragraph that is too long or that goes past the height the log keeps, or -1.
+// The cut never goes through a table or frame: it falls before the outermost one around it.
+int richCutPosition(QTextDocument *doc, int start, const LogGeometry &geometry)
+{
+    double height = 0.0;
+    int cut = -1;
+    for (QTextBlock block = doc->findBlock(start); block.isValid(); block = block.next()) {
+        const QString text = block.text();
+        if (text.size() > maxParagraphChars) {
+            cut = block.position() + maxParagraphChars;
+            if (text.at(maxParagraphChars).isLowSurrogate())
+                --cut;
+            break;
+        }
+        const QTextBlockFormat format = block.blockFormat();
+        height += paragraphHeight(text.size(), text.count(QChar::LineSeparator), geometry)
+                  + format.topMargin() + format.bottomMargin();
+        if (height > maxLogHeight) {
+            cut = block.position();
+            break;
+        }
+    }
+    // A table or frame is laid out in one piece too.
+    QTextFrame *root = doc->rootFrame();
+    for (QTextFrame *frame : root->childFrames()) {
+        if (frame->firstPosition() < start || (cut >= 0 && frame->firstPosition() > cut))
+            continue;
+        if (frame->lastPosition() - frame->firstPosition() > 2 * maxParagraphChars) {
+            cut = frame->firstPosition() - 1;
+            break;
+        }
+    }
+    if (cut < 0)
+        return -1;
+    QTextFrame *frame = doc->frameAt(cut);
+    while (frame && frame != root && frame->parentFrame() != root)
+        frame = frame->parentFrame();
+    if (frame && frame != root)
+        cut = frame->firstPosition() - 1;
+    return std::max(cut, start);
+}
+
+// Appends the result to `doc` as one append of its whole text would, shortened to what the log
+// can take; a shortened result is followed by the line that says so.
+void appendResult(QTextDocument *doc, const AppendFormats &formats, const ResultSource &source,
+                  const LogGeometry &geometry)
+{
+    QString text = decodeResult(source.bytes, source.complete);
+    bool whole = source.complete;
+    const bool rich = Qt::mightBeRichText(text);
+    if (!rich) {
+        const qsizetype shown = plainShownLength(text, geometry);
+        if (shown < text.size()) {
+            text.truncate(shown);
+            whole = false;
+        }
+    }
+
+    QTextCursor cursor(doc);
+    cursor.beginEditBlock();
+    const int start = beginAppend(cursor, formats);
+    if (rich)
+        cursor.insertHtml(text);
+    else
+        cursor.insertText(text);
+    cursor.endEditBlock();
+    text.clear();
+
+    if (rich) {
+        const int cut = richCutPosition(doc, start, geometry);
+        if (cut >= 0) {
+            QTextCursor tail(doc);
+            tail.setPosition(cut);
+            tail.movePosition(QTextCursor::End, QTextCursor::KeepAnchor);
+            tail.removeSelectedText();
+            whole = false;
+        }
+    }
+    if (!whole)
+        appendHtml(doc, formats, tooLargeLine(source.path, std::max<qint64>(source.fileSize, source.bytes.size())));
+}
+
+// Lets the scroll bars follow a layout finished outside the event loop (the layout itself would
+// tell the editor only on its next timer).
+void publishDocumentSize(QTextDocument *doc)
+{
+    QAbstractTextDocumentLayout *layout = doc->documentLayout();
+    emit layout->documentSizeChanged(layout->documentSize());
+}
+
+void scrollAfterAppend(QTextEdit *log, bool atBottom)
+{
+    if (atBottom) {
+        QScrollBar *bar = log->verticalScrollBar();
+        bar->setValue(bar->maximum());
+    }
+    log->scrollToAnchor(titleAnchor);
+}
+
+// A small result, shown before returning.
+void showNow(QTextEdit *log, const ResultSource &source)
+{
+    QTextDocument *doc = log->document();
+    const bool atBottom = logAtBottom(log);
+    const QTextCursor editorCursor = log->textCursor();
+    const QTextCharFormat editorCharFormat = editorCursor.charFormat();
+    const AppendFormats formats{editorCursor.blockFormat(), editorCharFormat};
+
+    // Laid out in one pass after the insertion: the editor lays out an insertion at once, which
+    // gets very slow for tall texts; a null page size defers it, and restoring the page size makes
+    // the layout start over lazily from the top.
+    const QSizeF pageSize = doc->pageSize();
+    doc->setPageSize(QSizeF(0, 0));
+    appendResult(doc, formats, source, geometryOf(log));
+    doc->setPageSize(pageSize);
+
+    if (!log->textCursor().hasSelection())
+        log->setCurrentCharFormat(editorCharFormat);
+    publishDocumentSize(doc);
+    scrollAfterAppend(log, atBottom);
+}
+
+// A larger result: the log's text with the result appended is built in a copy of the log's
+// document on a worker thread; the copy then replaces the log's document and is laid out in
+// slices from the event loop. Lives as a child of the log, so it never outlives it.
+class ResultDisplayJob : public QObject
+{
+public:
+    ResultDisplayJob(QTextEdit *log, ResultSource source);
+    ~ResultDisplayJob() override;
+
+    bool isActive() const { return m_active; }
+    void cancel();
+
+private:
+    void built();
+    void layoutSlice();
+    void finish();
+
+    QPointer<QTextEdit> m_log;
+    QPointer<QTextDocument> m_logDocument; // the document the copy replaces
+    QTextDocument *m_copy = nullptr;       // owned until handed to the log
+    QPointer<QTextDocument> m_shown;       // the copy once it is the log's document
+    QThread *m_worker = nullptr;
+    QTimer m_layoutTimer;
+    QMetaObject::Connection m_watch;
+    ResultSource m_source;
+    AppendFormats m_formats;
+    LogGeometry m_geometry;
+    QTextCharFormat m_editorCharFormat;
+    int m_oldLength = 0;
+    int m_cursorAnchor = 0;
+    int m_cursorPosition = 0;
+    int m_scrollValue = 0;
+    int m_layoutPosition = 0;
+    bool m_atBottom = false;
+    bool m_active = true;
+};
+
+ResultDisplayJob::ResultDisplayJob(QTextEdit *log, ResultSource source)
+    : QObject(log), m_log(log), m_logDocument(log->document()), m_source(std::move(source))
+{
+    QTextDocument *doc = log->document();
+    const QTextCursor editorCursor = log->textCursor();
+    m_editorCharFormat = editorCursor.charFormat();
+    m_formats = {editorCursor.blockFormat(), m_editorCharFormat};
+    m_geometry = geometryOf(log);
+    m_atBottom = logAtBottom(log);
+    m_scrollValue = log->verticalScrollBar()->value();
+    m_cursorAnchor = editorCursor.anchor();
+    m_cursorPosition = editorCursor.position();
+    m_oldLength = doc->characterCount();
+
+    m_copy = doc->clone();
+    m_copy->setMaximumBlockCount(doc->maximumBlockCount());
+    m_copy->setBaseUrl(doc->baseUrl());
+    m_copy->setDefaultCursorMoveStyle(doc->defaultCursorMoveStyle());
+    m_copy->setUndoRedoEnabled(false);
+
+    // Anyone else changing the log meanwhile makes the copy stale: the display then gives way.
+    m_watch = connect(doc, &QTextDocument::contentsChange, this, [this] { cancel(); });
+
+    QThread *gui = thread();
+    m_worker = QThread::create([this, gui] {
+        appendResult(m_copy, m_formats, m_source, m_geometry);
+        m_source.bytes = QByteArray();
+        m_copy->moveToThread(gui);
+    });
+    // The copy's frames and lists are created by the worker: they must belong to its thread.
+    m_copy->moveToThread(m_worker);
+    connect(m_worker, &QThread::finished, this, [this] { built(); });
+    m_worker->start();
+
+    m_layoutTimer.setInterval(0);
+    connect(&m_layoutTimer, &QTimer::timeout, this, [this] { layoutSlice(); });
+}
+
+ResultDisplayJob::~ResultDisplayJob()
+{
+    if (m_worker) {
+        m_worker->wait();
+        delete m_worker;
+    }
+    delete m_copy;
+}
+
+void ResultDisplayJob::cancel()
+{
+    if (!m_active)
+        return;
+    m_active = false;
+    disconnect(m_watch);
+    m_layoutTimer.stop();
+    // A worker still running cannot be stopped; built() drops its copy when it is done.
+    if (!m_worker)
+        deleteLater();
+}
+
+void ResultDisplayJob::built()
+{
+    m_worker->wait();
+    delete m_worker;
+    m_worker = nullptr;
+    if (!m_active || !m_log || !m_logDocument || m_log->document() != m_logDocument) {
+        m_active = false;
+        deleteLater();
+        return;
+    }
+    disconnect(m_watch);
+
+    QTextDocument *copy = m_copy;
+    m_copy = nullptr;
+    copy->setUndoRedoEnabled(m_logDocument->isUndoRedoEnabled());
+    // Owned as the document it replaces was: the editor deletes that one if it owned it.
+    copy->setParent(m_logDocument->parent());
+    m_shown = copy;
+    m_log->setDocument(copy);
+
+    m_log->verticalScrollBar()->setValue(m_scrollValue);
+
+    // Only clearing or replacing the text stops the layout; later entries just come after it.
+    m_watch = connect(copy, &QTextDocument::contentsChange, this, [this](int, int removed, int) {
+        if (removed > 0)
+            cancel();
+    });
+    m_layoutTimer.start();
+}
+
+void ResultDisplayJob::layoutSlice()
+{
+    if (!m_active)
+        return;
+    if (!m_log || !m_shown || m_log->document() != m_shown) {
+        cancel();
+        return;
+    }
+    // Lay out up to a position at a time, for about a frame's time per turn of the event loop.
+    constexpr int step = 8192;
+    constexpr qint64 sliceMs = 40;
+    QTextDocument *doc = m_shown;
+    QAbstractTextDocumentLayout *layout = doc->documentLayout();
+    const int end = doc->characterCount();
+    QElapsedTimer clock;
+    clock.start();
+    while (m_layoutPosition < end && clock.elapsed() < sliceMs) {
+        m_layoutPosition = std::min(end, m_layoutPosition + step);
+        const QTextBlock block = doc->findBlock(m_layoutPosition - 1);
+        layout->blockBoundingRect(block);
+        m_layoutPosition = std::max(m_layoutPosition, block.position() + block.length());
+    }
+    if (m_layoutPosition >= end)
+        finish();
+}
+
+void ResultDisplayJob::finish()
+{
+    m_layoutTimer.stop();
+    disconnect(m_watch);
+    m_active = false;
+    publishDocumentSize(m_shown);
+
+    // The editor's cursor goes back where it was, and moves with the end of the text when it was
+    // there, as in an append. Only now: placing it makes the editor lay out the text up to it.
+    const int changedAt = m_oldLength - 1;
+    const int added = m_shown->characterCount() - m_oldLength;
+    auto moved = [this, changedAt, added](int position) {
+        return std::min(position >= changedAt ? position + added : position,
+                        m_shown->characterCount() - 1);
+    };
+    QTextCursor cursor(m_shown);
+    cursor.setPosition(moved(m_cursorAnchor));
+    cursor.setPosition(moved(m_cursorPosition), QTextCursor::KeepAnchor);
+    m_log->setTextCursor(cursor);
+    if (!cursor.hasSelection())
+        m_log->setCurrentCharFormat(m_editorCharFormat);
+    scrollAfterAppend(m_log, m_atBottom);
+    deleteLater();
+}
+
+QList<ResultDisplayJob *> activeJobs(QTextEdit *log)
+{
+    QList<ResultDisplayJob *> jobs;
+    if (!log)
+        return jobs;
+    for (QObject *child : log->children()) {
+        auto *job = dynamic_cast<ResultDisplayJob *>(child);
+        if (job && job->isActive())
+            jobs.append(job);
+    }
+    return jobs;
+}
+
+} // namespace
 
 bool showResultFile(QTextEdit *log, const QString &path)
 {
+    cancelResultDisplay(log);
+
+    // Read-write like every file the dialog opens: a missing result is created, empty.
     QFile file(path);
     if (!file.open(QIODevice::ReadWrite))
         return false;
-    QTextStream in(&file);
-    log->append(in.readAll());
-    log->scrollToAnchor(QStringLiteral("TITLE"));
+    ResultSource source;
+    source.path = path;
+    source.fileSize = file.size();
+    source.bytes = file.read(showLimitBytes);
+    source.complete = source.bytes.size() < showLimitBytes || file.atEnd();
+    file.close();
+
+    if (source.complete && source.bytes.size() <= resultShownNowBytes)
+        showNow(log, source);
+    else
+        new ResultDisplayJob(log, std::move(source));
     return true;
 }
 
-void cancelResultDisplay(QTextEdit *) {}
+void cancelResultDisplay(QTextEdit *log)
+{
+    for (ResultDisplayJob *job : activeJobs(log))
+        job->cancel();
+}
+
+bool resultDisplayBusy(QTextEdit *log)
+{
+    return !activeJobs(log).isEmpty();
+}
