@@ -1,6 +1,8 @@
 list(APPEND MORVEL_RUN_LOGIC
   ${CMAKE_CURRENT_LIST_DIR}/runlogic.h
-  ${CMAKE_CURRENT_LIST_DIR}/runlogic.cpp)
+  ${CMAKE_CURRENT_LIST_DIR}/runlogic.cpp
+  ${CMAKE_CURRENT_LIST_DIR}/resultdisplaytext.h
+  ${CMAKE_CURRENT_LIST_DIR}/resultdisplaytext.cpp)
 list(APPEND MORVEL_RUN_DIALOG
   ${CMAKE_CURRENT_LIST_DIR}/resultdisplay.h
   ${CMAKE_CURRENT_LIST_DIR}/resultdisplay.cpp
