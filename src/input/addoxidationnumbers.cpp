@@ -5,6 +5,7 @@
 #include "logstyle.h"
 
 #include <QFile>
+#include <QFileInfo>
 
 void Import::addOxidationNumbers()
 {
@@ -34,7 +35,12 @@ void Import::addOxidationNumbers()
     if (rewrite.outcome != CifRewrite::Outcome::Rewritten)
         return;
 
-    switch (replaceFileContent(workingDir + QLatin1String("/tmp.cif"), rewrite.text.toLatin1(), inputFile)) {
+    // An input that is itself called tmp.cif must not be emptied before it is replaced.
+    QString temporaryPath = workingDir + QLatin1String("/tmp.cif");
+    if (QFileInfo(temporaryPath) == QFileInfo(inputFile))
+        temporaryPath += QLatin1String(".new");
+
+    switch (replaceFileContent(temporaryPath, rewrite.text.toLatin1(), inputFile)) {
     case ReplaceResult::CannotOpenTemporary:
         importlog->append(LogStyle::error(QStringLiteral(" Cannot open temporary file in read-write mode! ")));
         return;

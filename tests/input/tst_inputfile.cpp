@@ -38,6 +38,7 @@ private slots:
     void browse_data();
     void browse();
     void refusedInputStaysCurrent();
+    void workedExampleTwice_data();
     void workedExampleTwice();
     void inputLeftUnchanged_data();
     void inputLeftUnchanged();
@@ -149,13 +150,23 @@ void TestInputFile::refusedInputStaysCurrent()
     QCOMPARE(dialog.inputpath->text(), file);
 }
 
+void TestInputFile::workedExampleTwice_data()
+{
+    QTest::addColumn<QString>("base");
+    QTest::newRow("x.cif") << "x";
+    QTest::newRow("an input called tmp.cif") << "tmp";
+}
+
 void TestInputFile::workedExampleTwice()
 {
+    QFETCH(QString, base);
     QTemporaryDir dir;
-    const QString file = dir.filePath("x.cif");
+    const QString file = dir.filePath(base + ".cif");
+    const QString backup = base + "_old.cif";
     writeFile(file, exampleCif);
     writeFile(dir.filePath("oxidation.dat"), exampleTable);
-    writeFile(dir.filePath("tmp.cif"), QByteArray(10000, '#')); // longer than the new text
+    if (base != "tmp")
+        writeFile(dir.filePath("tmp.cif"), QByteArray(10000, '#')); // longer than the new text
     Import dialog;
     ModalDriver driver;
     driver.chooseFile(file);
@@ -163,13 +174,13 @@ void TestInputFile::workedExampleTwice()
     pressBrowse(dialog, driver);
 
     QCOMPARE(fileBytes(file), exampleRewritten);
-    QCOMPARE(fileBytes(dir.filePath("x_old.cif")), exampleCif);
-    QVERIFY(!QFile::exists(dir.filePath("tmp.cif")));
+    QCOMPARE(fileBytes(dir.filePath(backup)), exampleCif);
+    QCOMPARE(QDir(dir.path()).entryList(QDir::Files), (QStringList{"oxidation.dat", base + ".cif", backup}));
     const QStringList tail{"The input CIF file has been modified according to \"oxidation.dat\" file info.",
                            "Ready to import the CIF file then to run MORVEL !"};
     QCOMPARE(shownLines(dialog.importlog),
              QStringList({noOxidation, "Using modified CIF file, charges informations taken from \"oxidation.dat\" file",
-                          "Original CIF file has been saved under x_old.cif",
+                          "Original CIF file has been saved under " + backup,
                           "Found file \"oxidation.dat\" in working directory :",
                           "Got the following list of atom symbols and charges :", "Fe1  Fe3+  3", "O1  O2-  -2",
                           "Now identifying pairs atom symbol/atom names :", "Atom Fe1 has symbol Fe3+ and charge 3",
@@ -184,8 +195,8 @@ void TestInputFile::workedExampleTwice()
     driver.answerBox(QMessageBox::Ok);
     pressBrowse(dialog, driver);
     QCOMPARE(fileBytes(file), QByteArray(exampleRewritten).replace("0.0 0.0 0.0", "0.25 0.25 0.25"));
-    QCOMPARE(fileBytes(dir.filePath("x_old.cif")), exampleCif);
-    QCOMPARE(shownLines(dialog.importlog).value(2), "Cannot overwrite save file : x_old.cif");
+    QCOMPARE(fileBytes(dir.filePath(backup)), exampleCif);
+    QCOMPARE(shownLines(dialog.importlog).value(2), "Cannot overwrite save file : " + backup);
     QCOMPARE(shownLines(dialog.importlog).mid(13), tail);
 }
 
