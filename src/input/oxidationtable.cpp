@@ -19,16 +19,17 @@ QStringList tableFields(const QString &reduced)
     }
     return fields;
 }
+
+// The echo line of one entry: name, symbol and charge, two spaces apart.
+QString echoLine(const OxidationEntry &entry)
+{
+    return entry.name + QLatin1String("  ") + entry.symbol + QLatin1String("  ") + formatCharge(entry.charge);
+}
 } // namespace
 
 QString formatCharge(float charge)
 {
     return QString::number(double(charge), 'g', 6);
-}
-
-QString echoLine(const OxidationEntry &entry)
-{
-    return entry.name + QLatin1String("  ") + entry.symbol + QLatin1String("  ") + formatCharge(entry.charge);
 }
 
 OxidationTableRead parseOxidationTable(const QString &text)

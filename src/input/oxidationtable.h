@@ -22,9 +22,6 @@ OxidationTableRead parseOxidationTable(const QString &text);
 // A charge as the log and the job files show it: C locale, 'g' form, six significant digits.
 QString formatCharge(float charge);
 
-// The echo line of one entry: name, symbol and charge, two spaces apart.
-QString echoLine(const OxidationEntry &entry);
-
 // The first entry whose trimmed name equals key (the key itself is not trimmed); the
 // not-found entry (empty name and symbol, charge 1000) when none does.
 OxidationEntry firstEntryForName(const QList<OxidationEntry> &table, const QString &key);
@@ -41,7 +38,6 @@ public:
 
     OxidationEntry entryForName(const QString &key) const;
     float chargeForSymbol(const QString &symbol) const;
-    bool isEmpty() const { return table.isEmpty(); }
 
 private:
     QList<OxidationEntry> table;
