@@ -64,7 +64,9 @@ int main(int argc, char **argv)
         tick.stop();
 
         const QString text = dialog.importlog->toPlainText();
-        const QString last = text.section(QLatin1Char('\n'), -1).left(60);
+        QStringList lines = text.split(QLatin1Char('\n'));
+        lines.removeAll(QString());
+        const QString last = lines.isEmpty() ? QString() : lines.last().left(60);
         std::printf("%-8g %-6s %12lld %14lld %12lld  %s\n", mb, rich ? "rich" : "plain", shown, longest,
                     qint64(text.count(QLatin1Char('\n')) + 1), qPrintable(last));
         std::fflush(stdout);
