@@ -19,9 +19,9 @@ bool endsAtomRows(const QString &line)
 }
 
 // Atom row fields: single spaces separate, runs count as one; tabs do not separate.
-QStringList rowFields(const QString &row)
+QList<QStringView> rowFields(const QString &row)
 {
-    return row.split(QLatin1Char(' '), Qt::SkipEmptyParts, Qt::CaseSensitive);
+    return QStringView(row).split(QLatin1Char(' '), Qt::SkipEmptyParts, Qt::CaseSensitive);
 }
 
 const float noMatchAbove = 100.0f;
@@ -84,8 +84,9 @@ AtomRowRewrite rewriteAtomRows(const QStringList &atomRows, const OxidationIndex
     r.log.append(QStringLiteral("<br><b> Now identifying pairs atom symbol/atom names : </b>"));
     StringIndex known;
 
+    ChargeTexts charges;
     for (const QString &row : atomRows) {
-        QStringList fields = rowFields(row);
+        const QList<QStringView> fields = rowFields(row);
         if (fields.size() < 2) {
             r.log.append(QStringLiteral("<br><b> The following atom line is probably incorrect : </b>"));
             r.log.append(row);
@@ -96,13 +97,24 @@ AtomRowRewrite rewriteAtomRows(const QStringList &atomRows, const OxidationIndex
         if (entry.charge > noMatchAbove)
             entry = index.entryForName(fields.at(1).trimmed());
         if (entry.charge > noMatchAbove) {
-            r.unmatchedLabels.append(fields.at(0));
+            r.unmatchedLabels.append(fields.at(0).toString());
             continue;
         }
-        r.log.append(QLatin1String(" Atom ") + fields.at(0) + QLatin1String(" has symbol ") + entry.symbol
-                     + QLatin1String(" and charge ") + formatCharge(entry.charge));
-        fields[1] = entry.symbol;
-        r.rows.append(fields.join(QLatin1Char(' ')));
+        QString said = QStringLiteral(" Atom ");
+        said += fields.at(0);
+        said += QLatin1String(" has symbol ") + entry.symbol + QLatin1String(" and charge ") + charges.text(entry.charge);
+        r.log.append(said);
+        // The row again, its fields one space apart, with the table's symbol as the second.
+        QString rewritten;
+        rewritten.reserve(row.size() + entry.symbol.size());
+        rewritten += fields.at(0);
+        rewritten += QLatin1Char(' ');
+        rewritten += entry.symbol;
+        for (qsizetype i = 2; i < fields.size(); ++i) {
+            rewritten += QLatin1Char(' ');
+            rewritten += fields.at(i);
+        }
+        r.rows.append(rewritten);
         if (known.insert(entry.symbol, 0))
             r.symbols.append(entry.symbol);
     }
@@ -119,8 +131,9 @@ QString composeCifText(const CifSections &sections, const AtomRowRewrite &rows, 
 {
     QStringList symbolRows;
     symbolRows.reserve(rows.symbols.size());
+    ChargeTexts charges;
     for (const QString &symbol : rows.symbols)
-        symbolRows.append(symbol + QLatin1Char(' ') + formatCharge(index.chargeForSymbol(symbol)));
+        symbolRows.append(symbol + QLatin1Char(' ') + charges.text(index.chargeForSymbol(symbol)));
     const QStringList inserted{QStringLiteral("loop_"), QStringLiteral("_atom_type_symbol"),
                                QStringLiteral("_atom_type_oxidation_number")};
 

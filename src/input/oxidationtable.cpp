@@ -2,6 +2,8 @@
 #include "linereader.h"
 #include "logstyle.h"
 
+#include <cstring>
+
 namespace {
 const float notFound = 1000.0f;
 
@@ -21,15 +23,29 @@ QStringList tableFields(const QString &reduced)
 }
 
 // The echo line of one entry: name, symbol and charge, two spaces apart.
-QString echoLine(const OxidationEntry &entry)
+QString echoLine(const OxidationEntry &entry, ChargeTexts &charges)
 {
-    return entry.name + QLatin1String("  ") + entry.symbol + QLatin1String("  ") + formatCharge(entry.charge);
+    return entry.name + QLatin1String("  ") + entry.symbol + QLatin1String("  ") + charges.text(entry.charge);
 }
 } // namespace
 
 QString formatCharge(float charge)
 {
     return QString::number(double(charge), 'g', 6);
+}
+
+QString ChargeTexts::text(float charge)
+{
+    quint32 bits;
+    std::memcpy(&bits, &charge, sizeof bits);
+    for (const auto &k : known) {
+        if (k.first == bits)
+            return k.second;
+    }
+    QString t = formatCharge(charge);
+    if (known.size() < 32)
+        known.emplace_back(bits, t);
+    return t;
 }
 
 OxidationTableRead parseOxidationTable(const QString &text)
@@ -56,8 +72,9 @@ OxidationTableRead parseOxidationTable(const QString &text)
     read.complete = true;
     read.log.reserve(read.entries.size() + 1);
     read.log.append(QStringLiteral("<b>Got the following list of atom symbols and charges :  </b>"));
+    ChargeTexts charges;
     for (const OxidationEntry &entry : read.entries)
-        read.log.append(echoLine(entry));
+        read.log.append(echoLine(entry, charges));
     return read;
 }
 
@@ -92,7 +109,7 @@ OxidationIndex::OxidationIndex(const QList<OxidationEntry> &table)
     }
 }
 
-OxidationEntry OxidationIndex::entryForName(const QString &key) const
+OxidationEntry OxidationIndex::entryForName(QStringView key) const
 {
     const qsizetype i = firstByName.value(key);
     return i < 0 ? OxidationEntry{QString(), QString(), notFound} : table.at(i);

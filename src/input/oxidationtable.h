@@ -7,6 +7,9 @@
 #include <QList>
 #include <QStringList>
 
+#include <utility>
+#include <vector>
+
 // What was understood from the text of oxidation.dat, and the log lines that tell the user so
 // (everything after the "Found file" line). An invalid line stops the reading: the entries of
 // the lines above it are kept and no echo follows.
@@ -22,6 +25,16 @@ OxidationTableRead parseOxidationTable(const QString &text);
 // A charge as the log and the job files show it: C locale, 'g' form, six significant digits.
 QString formatCharge(float charge);
 
+// formatCharge for many rows: a table holds few distinct charges, so their texts are kept.
+class ChargeTexts
+{
+public:
+    QString text(float charge);
+
+private:
+    std::vector<std::pair<quint32, QString>> known;
+};
+
 // The first entry whose trimmed name equals key (the key itself is not trimmed); the
 // not-found entry (empty name and symbol, charge 1000) when none does.
 OxidationEntry firstEntryForName(const QList<OxidationEntry> &table, const QString &key);
@@ -36,7 +49,7 @@ class OxidationIndex
 public:
     explicit OxidationIndex(const QList<OxidationEntry> &table);
 
-    OxidationEntry entryForName(const QString &key) const;
+    OxidationEntry entryForName(QStringView key) const;
     float chargeForSymbol(const QString &symbol) const;
 
 private:

@@ -3,13 +3,13 @@
 #include <functional>
 #include <string_view>
 
-size_t StringIndex::hashOf(const QString &key)
+size_t StringIndex::hashOf(QStringView key)
 {
     return std::hash<std::u16string_view>()(
         std::u16string_view(reinterpret_cast<const char16_t *>(key.utf16()), size_t(key.size())));
 }
 
-size_t StringIndex::slotOf(const QString &key, size_t hash) const
+size_t StringIndex::slotOf(QStringView key, size_t hash) const
 {
     const size_t mask = buckets.size() - 1;
     for (size_t i = hash & mask;; i = (i + 1) & mask) {
@@ -61,7 +61,7 @@ bool StringIndex::insert(const QString &key, qsizetype value)
     return true;
 }
 
-qsizetype StringIndex::value(const QString &key) const
+qsizetype StringIndex::value(QStringView key) const
 {
     if (buckets.empty())
         return -1;

@@ -2,6 +2,7 @@
 #define MORVEL_STRINGINDEX_H
 
 #include <QString>
+#include <QStringView>
 
 #include <vector>
 
@@ -18,7 +19,7 @@ public:
     bool insert(const QString &key, qsizetype value);
 
     // The value stored with key, or -1.
-    qsizetype value(const QString &key) const;
+    qsizetype value(QStringView key) const;
 
 private:
     struct Slot
@@ -27,8 +28,8 @@ private:
         qsizetype entry = -1; // into keys and values; -1: empty
     };
 
-    static size_t hashOf(const QString &key);
-    size_t slotOf(const QString &key, size_t hash) const;
+    static size_t hashOf(QStringView key);
+    size_t slotOf(QStringView key, size_t hash) const;
     void rehash(size_t slotCount);
 
     std::vector<Slot> buckets; // a power of two in size, at most half full
