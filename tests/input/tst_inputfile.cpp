@@ -189,12 +189,13 @@ void TestInputFile::workedExampleTwice()
                  + tail);
     QVERIFY(dialog.importlog->toHtml().contains("#00cc00"));
 
-    // Again under the same name, with CR LF line ends: the first backup copy is kept.
-    writeFile(file, QByteArray(exampleCif).replace("\n", "\r\n").replace("0.0 0.0 0.0", "0.25 0.25 0.25"));
+    // Again under the same name, with CR LF line ends and bytes outside ASCII: the first backup
+    // copy is kept, and the bytes come back as they were.
+    writeFile(file, "#caf\xe9 \xff\r\n" + QByteArray(exampleCif).replace("\n", "\r\n").replace("0.0 0.0 0.0", "0.25 0.25 0.25"));
     driver.chooseFile(file);
     driver.answerBox(QMessageBox::Ok);
     pressBrowse(dialog, driver);
-    QCOMPARE(fileBytes(file), QByteArray(exampleRewritten).replace("0.0 0.0 0.0", "0.25 0.25 0.25"));
+    QCOMPARE(fileBytes(file), "#caf\xe9 \xff\n" + QByteArray(exampleRewritten).replace("0.0 0.0 0.0", "0.25 0.25 0.25"));
     QCOMPARE(fileBytes(dir.filePath(backup)), exampleCif);
     QCOMPARE(shownLines(dialog.importlog).value(2), "Cannot overwrite save file : " + backup);
     QCOMPARE(shownLines(dialog.importlog).mid(13), tail);
