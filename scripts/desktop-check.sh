@@ -1,0 +1,169 @@
+#!/usr/bin/env bash
+# Real-window check of an installed MorvelGUI (by hand, not part of CI).
+#
+# Builds, installs into a temporary prefix (program, stand-ins, .desktop entry, icon), copies demo/
+# to a temporary folder with the installed stand-ins beside it, starts the program there with the
+# command of the installed .desktop entry's Exec= line on a virtual X display (Xvfb), and drives a
+# whole demo job with xdotool: Browse, the path typed into Qt's file dialog and Return, any
+# message box answered with its default button (OK), Run. When MORVEL.OUT is complete it takes a
+# screenshot of the display with ImageMagick and saves it.
+#
+# Usage:  bash scripts/desktop-check.sh [rutile.cif | nacl.cif | quartz.in]     (default rutile.cif)
+#   MORVEL_BUILD_DIR   build folder (default: build/)
+#   MORVEL_SCREENSHOT  where the PNG goes (default: <build folder>/desktop-check.png)
+# Needs: Xvfb, xdotool, ImageMagick (apt-get install xvfb xdotool imagemagick).
+set -euo pipefail
+root=$(cd "$(dirname "$0")/.." && pwd)
+build=${MORVEL_BUILD_DIR:-$root/build}
+input=${1:-rutile.cif}
+shot=${MORVEL_SCREENSHOT:-$build/desktop-check.png}
+
+case "$input" in
+  *.cif) format=cif; dialog_title="Select an input CIF file" ;;
+  *.in) format=handmade; dialog_title="Select an input file" ;;
+  *) echo "input must be one of the demo files: rutile.cif, nacl.cif or quartz.in" >&2; exit 2 ;;
+esac
+[ -f "$root/demo/$input" ] || { echo "no demo/$input" >&2; exit 2; }
+for tool in Xvfb xdotool import cmake; do
+  command -v "$tool" >/dev/null || { echo "$tool is missing: apt-get install xvfb xdotool imagemagick" >&2; exit 2; }
+done
+
+step() { echo "== $*"; }
+fail() { echo "FAILED: $*" >&2; exit 1; }
+
+# Polls a command for up to $1 tenths of a second; prints its output once it succeeds.
+wait_for() {
+  local tries=$1; shift
+  local out
+  for ((i = 0; i < tries; i++)); do
+    if out=$("$@" 2>/dev/null) && [ -n "$out" ]; then
+      echo "$out"
+      return 0
+    fi
+    sleep 0.1
+  done
+  return 1
+}
+visible_window() { xdotool search --onlyvisible --name "$1" | head -n 1; }
+
+step "build ($build)"
+cmake -S "$root" -B "$build" -DCMAKE_BUILD_TYPE=RelWithDebInfo >/dev/null
+cmake --build "$build" -j2 --target MorvelGUI cif_parser morvel e2e_layout_probe >/dev/null
+
+tmp=$(mktemp -d "${TMPDIR:-/tmp}/morvelgui-desktop.XXXXXX")
+app_pid=
+xvfb_pid=
+cleanup() {
+  local pid
+  for pid in $app_pid $xvfb_pid; do
+    kill "$pid" 2>/dev/null || true
+    wait "$pid" 2>/dev/null || true
+  done
+  rm -rf "$tmp"
+}
+trap cleanup EXIT
+
+step "install into a temporary prefix"
+prefix=$tmp/prefix
+cmake --install "$build" --prefix "$prefix" >/dev/null
+desktop=$prefix/share/applications/morvelgui.desktop
+for f in "$prefix/bin/MorvelGUI" "$prefix/bin/cif_parser" "$prefix/bin/morvel" "$desktop" \
+         "$prefix/share/icons/hicolor/64x64/apps/morvelgui.png"; do
+  [ -e "$f" ] || fail "not installed: ${f#"$prefix"/}"
+done
+
+step "demo copy with the installed stand-ins"
+work=$tmp/work
+mkdir "$work"
+cp -r "$root/demo/." "$work/"
+ln -s "$prefix/bin/morvel" "$work/morvel"
+ln -s "$prefix/bin/cif_parser" "$work/cif_parser"
+
+# The Exec= value without field codes (%f, %U, ...), split into words as a launcher does.
+exec_line=$(sed -n 's/^Exec=//p' "$desktop" | head -n 1)
+exec_line=$(sed -E 's/(^| )%[fFuUdDnNickvm]//g' <<<"$exec_line")
+read -r -a exec_cmd <<<"$exec_line"
+[ ${#exec_cmd[@]} -gt 0 ] || fail "no Exec= line in the installed .desktop entry"
+resolved=$(PATH="$prefix/bin:$PATH" command -v "${exec_cmd[0]}") || fail "Exec= command ${exec_cmd[0]} not found"
+[ "$resolved" = "$prefix/bin/MorvelGUI" ] || fail "Exec= command resolves to $resolved, not the installed program"
+
+step "virtual display"
+Xvfb -displayfd 3 -screen 0 1280x1024x24 -nolisten tcp 3>"$tmp/display" >"$tmp/xvfb.log" 2>&1 &
+xvfb_pid=$!
+display=$(wait_for 100 cat "$tmp/display") || fail "Xvfb did not start: $(cat "$tmp/xvfb.log")"
+export DISPLAY=":$display"
+unset WAYLAND_DISPLAY QT_QPA_PLATFORM
+
+# Where the controls lie in the window, on this display with its fonts (the probe builds the same
+# window and quits before the program starts).
+layout=$(cd "$work" && "$build/tests/e2e/e2e_layout_probe" 2>/dev/null) || fail "layout probe failed"
+at() { awk -v n="$1" '$1 == n { print $2, $3 }' <<<"$layout"; }
+read -r browse_x browse_y <<<"$(at browseinput)"
+read -r run_x run_y <<<"$(at importButton)"
+read -r format_x format_y <<<"$(at InputBox)"
+read -r probe_w probe_h <<<"$(at window)"
+
+step "start: ${exec_cmd[*]} (from the installed .desktop entry) in $work"
+(cd "$work" && PATH="$prefix/bin:$PATH" exec "${exec_cmd[@]}") >"$tmp/app.log" 2>&1 &
+app_pid=$!
+wid=$(wait_for 100 visible_window '^MorvelGUI$') || fail "no MorvelGUI window: $(cat "$tmp/app.log")"
+eval "$(xdotool getwindowgeometry --shell "$wid")"
+[ "$WIDTH" = "$probe_w" ] && [ "$HEIGHT" = "$probe_h" ] \
+  || fail "window is ${WIDTH}x$HEIGHT but the probe laid it out as ${probe_w}x$probe_h"
+xdotool windowfocus --sync "$wid"
+sleep 0.5
+
+click() { xdotool mousemove --window "$wid" "$1" "$2" click 1; }
+
+if [ "$format" = handmade ]; then
+  step "input format: Hand-made"
+  click "$format_x" "$format_y"
+  sleep 0.5
+  xdotool key Down Return
+  sleep 0.3
+fi
+
+step "Browse, type $work/$input"
+click "$browse_x" "$browse_y"
+fd=$(wait_for 100 visible_window "^$dialog_title\$") || fail "no file dialog"
+xdotool windowfocus --sync "$fd"
+sleep 0.5
+xdotool type --delay 20 "$work/$input"
+sleep 0.5
+# The path completer may take the first Return.
+for _ in 1 2 3; do
+  xdotool key Return
+  sleep 0.7
+  [ -z "$(visible_window "^$dialog_title\$" 2>/dev/null)" ] && break
+done
+[ -z "$(visible_window "^$dialog_title\$" 2>/dev/null)" ] || fail "the file dialog did not take the path"
+
+# Any message box (the oxidation-number question for rutile.cif) gets its default button, OK.
+answered=0
+for _ in $(seq 15); do
+  if box=$(visible_window '^WARNING!$' 2>/dev/null) && [ -n "$box" ]; then
+    step "message box: OK"
+    xdotool windowfocus --sync "$box"
+    sleep 0.3
+    xdotool key Return
+    answered=$((answered + 1))
+    sleep 0.7
+  else
+    sleep 0.1
+  fi
+done
+
+step "Run"
+xdotool windowfocus --sync "$wid"
+click "$run_x" "$run_y"
+ends_complete() { tail -n 1 "$work/MORVEL.OUT" | grep -E 'Normal end|</html>'; }
+wait_for 300 ends_complete >/dev/null || fail "no complete MORVEL.OUT: $(tail -n 3 "$work/MORVEL.OUT" 2>/dev/null)"
+sleep 1.5
+
+mkdir -p "$(dirname "$shot")"
+import -window root "$shot"
+step "screenshot: $shot"
+echo "message boxes answered: $answered"
+[ -f "$work/${input%%.*}_old.cif" ] && echo "completed from oxidation.dat; original kept as ${input%%.*}_old.cif"
+echo "result (MORVEL.OUT), first site:"
+awk '/^Interatomic distances/ { on = 1 } on && /Coordination number/ { print; exit } on' "$work/MORVEL.OUT" | head -n 20
