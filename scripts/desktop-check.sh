@@ -6,7 +6,8 @@
 # command of the installed .desktop entry's Exec= line on a virtual X display (Xvfb), and drives a
 # whole demo job with xdotool: Browse, the path typed into Qt's file dialog and Return, any
 # message box answered with its default button (OK), Run. When MORVEL.OUT is complete it takes a
-# screenshot of the display with ImageMagick and saves it.
+# screenshot of the display with ImageMagick and saves it, then a second one with the log
+# scrolled to its end (<name>-log-end.png).
 #
 # Usage:  bash scripts/desktop-check.sh [rutile.cif | nacl.cif | quartz.in]     (default rutile.cif)
 #   MORVEL_BUILD_DIR   build folder (default: build/)
@@ -163,6 +164,14 @@ sleep 1.5
 mkdir -p "$(dirname "$shot")"
 import -window root "$shot"
 step "screenshot: $shot"
+# A second one with the log scrolled to its end by the mouse wheel, so that the distances
+# themselves are seen in the window whatever the view was left at.
+read -r log_x log_y <<<"$(at importlog)"
+xdotool mousemove --window "$wid" "$log_x" "$log_y" click --repeat 400 --delay 2 5
+sleep 0.7
+shot_end=${shot%.png}-log-end.png
+import -window root "$shot_end"
+step "screenshot, log scrolled to its end: $shot_end"
 echo "message boxes answered: $answered"
 [ -f "$work/${input%%.*}_old.cif" ] && echo "completed from oxidation.dat; original kept as ${input%%.*}_old.cif"
 echo "result (MORVEL.OUT), first site:"
