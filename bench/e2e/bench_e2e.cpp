@@ -7,6 +7,8 @@
 // morvel.in, then morvel). Measurements of the two ways alternate, so both meet the same load.
 // The dialog's overhead is the difference of the medians; it must stay under 20 ms per job.
 // Run:  QT_QPA_PLATFORM=offscreen build/bench/e2e/bench_e2e [jobs per way, default 100]
+// Cross-check of the direct figure, in a demo copy with the stand-ins and a morvel.par beside it:
+//   hyperfine -N --warmup 5 './cif_parser nacl.cif morvel.in' './morvel'
 #include "demofolder.h"
 #include "import.h"
 #include "modaldriver.h"
