@@ -9,7 +9,9 @@ void Import::copyInputFile(const QString &inputPath)
     if (QFile::exists(targetPath))
         QFile::remove(targetPath);
     QFile target(targetPath);
-    if (!target.open(QIODevice::ReadWrite)) {
+    // Truncate: where the old file could not be removed (a folder that takes no new files), its
+    // longer text must not outlast the new one.
+    if (!target.open(QIODevice::ReadWrite | QIODevice::Truncate)) {
         importlog->append(LogStyle::error(
             QStringLiteral(" Something went wrong while opening a new \"morvel.in\" file! ")));
         return;

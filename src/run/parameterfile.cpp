@@ -13,7 +13,9 @@ void Import::writeParameterFile()
     if (QFile::exists(path))
         QFile::remove(path);
     QFile par(path);
-    if (!par.open(QIODevice::ReadWrite)) {
+    // Truncate: where the old file could not be removed (a folder that takes no new files), its
+    // longer text must not outlast the new one.
+    if (!par.open(QIODevice::ReadWrite | QIODevice::Truncate)) {
         importlog->append(LogStyle::error(
             QStringLiteral(" Something went wrong while opening a new \"morvel.par\" file! ")));
         return;
