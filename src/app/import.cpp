@@ -1,3 +1,4 @@
+#include "childprocess.h"
 #include "import.h"
 #include "processexit.h"
 
@@ -32,6 +33,10 @@ Import::~Import()
     // reach a dialog that is half destroyed.
     importProcess->disconnect(this);
     morvelProcess->disconnect(this);
+    killProgram(importProcess);
+    killProgram(morvelProcess);
+    importProcess->waitForFinished();
+    morvelProcess->waitForFinished();
     delete importProcess;
     delete printGroup;
 }

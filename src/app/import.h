@@ -65,6 +65,7 @@ public:
     int maxVAtoms = 0;
     int printType = 0;
     bool importError = false;
+    QByteArray converterOutputTail; // the end of the converter's last output, see outputImport
     QList<OxidationEntry> oxidationTable;
 
     // --- Job run: state tracking of the two child programs (src/run) ---

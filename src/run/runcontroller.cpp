@@ -1,3 +1,4 @@
+#include "childprocess.h"
 #include "import.h"
 #include "logstyle.h"
 #include "resultdisplay.h"
@@ -31,6 +32,7 @@ void Import::startChild(QProcess *process, const QString &program, const QString
     process->setWorkingDirectory(QFileInfo(stagedInputPath).path());
     process->setProgram(resolvedProgramPath(program, QDir::currentPath()));
     process->setArguments(arguments);
+    runInOwnProcessGroup(process);
     process->start();
     // The child's start, or its failure, is reported here and not later from the event loop, so
     // that the slots reporting it run before the caller's next log line.
@@ -60,6 +62,7 @@ void Import::makeImport()
     cancelResultDisplay(importlog);
     importlog->clear();
     importError = false;
+    converterOutputTail.clear();
 
     writeParameterFile();
 
@@ -113,8 +116,8 @@ void Import::checkStart()
 
 void Import::outputImport()
 {
-    const QByteArray output = importProcess->readAllStandardOutput();
-    if (output.contains("ERROR")) {
+    // A flood of output arrives in many deliveries; the word may be cut between two of them.
+    if (outputReportsError(importProcess->readAllStandardOutput(), converterOutputTail)) {
         importError = true;
         endImport(converterReportedError);
     }
@@ -183,9 +186,9 @@ void Import::endImport(int exitCode)
 void Import::killImport()
 {
     importlog->append(QStringLiteral("<b>Killing Import program process</b>"));
-    importProcess->kill();
+    killProgram(importProcess);
     importlog->append(QStringLiteral("<b>Killing Morvel program process</b>"));
-    morvelProcess->kill();
+    killProgram(morvelProcess);
     // A killed program reports its end through the event loop; the idle state waits for that.
     updateRunButtons();
 }

@@ -56,6 +56,14 @@ QString converterCommand(const QString &parserProgram, const QString &inputFile,
            + stagedInputPath + q;
 }
 
+bool outputReportsError(const QByteArray &delivery, QByteArray &carry)
+{
+    const QByteArray word("ERROR");
+    const QByteArray joined = carry + delivery;
+    carry = joined.right(word.size() - 1);
+    return joined.contains(word);
+}
+
 bool isStagedInputName(const QString &inputFile)
 {
     return QFileInfo(inputFile).fileName().toLower().trimmed() == QLatin1String("morvel.in");

@@ -1,6 +1,7 @@
 #ifndef MORVEL_RUNLOGIC_H
 #define MORVEL_RUNLOGIC_H
 
+#include <QByteArray>
 #include <QString>
 #include <QStringList>
 
@@ -34,6 +35,11 @@ QStringList jobOptionsEcho(const JobOptions &options);
 // The command line of the CIF converter as the log shows it: three quoted paths.
 QString converterCommand(const QString &parserProgram, const QString &inputFile,
                          const QString &stagedInputPath);
+
+// Whether this delivery of the converter's output holds the word "ERROR". carry keeps the last
+// bytes of the previous delivery of the same run (empty at its start), so that a word split
+// between two deliveries is seen too, and a word is never counted twice.
+bool outputReportsError(const QByteArray &delivery, QByteArray &carry);
 
 // True when the name of the chosen file, lower-cased and trimmed, is the staged input's name.
 bool isStagedInputName(const QString &inputFile);

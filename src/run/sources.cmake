@@ -4,6 +4,8 @@ list(APPEND MORVEL_RUN_LOGIC
   ${CMAKE_CURRENT_LIST_DIR}/resultdisplaytext.h
   ${CMAKE_CURRENT_LIST_DIR}/resultdisplaytext.cpp)
 list(APPEND MORVEL_RUN_DIALOG
+  ${CMAKE_CURRENT_LIST_DIR}/childprocess.h
+  ${CMAKE_CURRENT_LIST_DIR}/childprocess.cpp
   ${CMAKE_CURRENT_LIST_DIR}/resultdisplay.h
   ${CMAKE_CURRENT_LIST_DIR}/resultdisplay.cpp
   ${CMAKE_CURRENT_LIST_DIR}/parameterfile.cpp
