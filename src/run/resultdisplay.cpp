@@ -177,13 +177,32 @@ void publishDocumentSize(QTextDocument *doc)
     emit layout->documentSizeChanged(layout->documentSize());
 }
 
+bool definesAnchor(const QTextDocument *doc, const QString &name)
+{
+    auto names = [&name](const QTextCharFormat &format) {
+        return format.isAnchor() && format.anchorNames().contains(name);
+    };
+    for (QTextBlock block = doc->begin(); block.isValid(); block = block.next()) {
+        if (names(block.charFormat()))
+            return true;
+        for (auto it = block.begin(); !it.atEnd(); ++it) {
+            if (names(it.fragment().charFormat()))
+                return true;
+        }
+    }
+    return false;
+}
+
 void scrollAfterAppend(QTextEdit *log, bool atBottom)
 {
     if (atBottom) {
         QScrollBar *bar = log->verticalScrollBar();
         bar->setValue(bar->maximum());
     }
-    log->scrollToAnchor(titleAnchor);
+    // QTextEdit scrolls to the top for an anchor it does not find; a result without one stays
+    // where the append left the view.
+    if (definesAnchor(log->document(), titleAnchor))
+        log->scrollToAnchor(titleAnchor);
 }
 
 // A small result, shown before returning.

@@ -203,10 +203,6 @@ void TestEndToEnd::rockSalt()
         const int tableTop = int(doc->documentLayout()->blockBoundingRect(table).top());
         QCOMPARE(bar->value(), qMin(tableTop, bar->maximum()));
     } else {
-        QEXPECT_FAIL("normal output, plain text",
-                     "src/run/resultdisplay.cpp scrolls to the anchor TITLE even when the result has none, "
-                     "and QTextEdit then scrolls to the top",
-                     Continue);
         QCOMPARE(bar->value(), bar->maximum());
     }
 

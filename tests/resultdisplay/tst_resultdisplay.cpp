@@ -142,7 +142,9 @@ void TestResultDisplay::looksLikeOneAppend()
         QString text = in.readAll();
         text.replace(QChar(0), QChar::ReplacementCharacter);
         reference.append(text);
-        reference.scrollToAnchor(QStringLiteral("TITLE"));
+        // Scrolling to an anchor that is not there would move the view to the top.
+        if (reference.toHtml().contains(QLatin1String("name=\"TITLE\"")))
+            reference.scrollToAnchor(QStringLiteral("TITLE"));
     }
     settle(reference); // its own late layout must not count as a stall of the display below
 
@@ -163,9 +165,15 @@ void TestResultDisplay::looksLikeOneAppend()
     settle(log);
     settle(reference);
     QCOMPARE(log.verticalScrollBar()->maximum(), reference.verticalScrollBar()->maximum());
-    QCOMPARE(log.verticalScrollBar()->value(), reference.verticalScrollBar()->value());
-    if (bytes.contains("TITLE"))
+    if (bytes.contains("TITLE")) {
+        QCOMPARE(log.verticalScrollBar()->value(), reference.verticalScrollBar()->value());
         QVERIFY(log.verticalScrollBar()->value() < log.verticalScrollBar()->maximum());
+    } else {
+        // Without the anchor the view stays at the bottom, where the append leaves it once the
+        // whole text is laid out (a single append of a tall text leaves it where its lazy layout
+        // had got to).
+        QCOMPARE(log.verticalScrollBar()->value(), log.verticalScrollBar()->maximum());
+    }
     QCOMPARE(QFileInfo(path).size(), qint64(bytes.size()));
 }
 
