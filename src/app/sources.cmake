@@ -5,4 +5,5 @@ list(APPEND MORVEL_APP_DIALOG
   ${CMAKE_CURRENT_LIST_DIR}/import.cpp
   ${CMAKE_CURRENT_LIST_DIR}/readtoolconfiguration.cpp
   ${CMAKE_CURRENT_LIST_DIR}/about.cpp
-  ${CMAKE_CURRENT_LIST_DIR}/logstyle.h)
+  ${CMAKE_CURRENT_LIST_DIR}/logstyle.h
+  ${CMAKE_CURRENT_LIST_DIR}/logbatch.h)

@@ -1,6 +1,7 @@
 #include "cifrewrite.h"
 #include "filereplace.h"
 #include "import.h"
+#include "logbatch.h"
 #include "inputpaths.h"
 #include "logstyle.h"
 
@@ -30,8 +31,7 @@ void Import::addOxidationNumbers()
 
     // Latin-1 both ways: every byte of an unchanged line is written back as it was read.
     const CifRewrite rewrite = rewriteCifText(QString::fromLatin1(original), OxidationIndex(oxidationTable));
-    for (const QString &line : rewrite.log)
-        importlog->append(line);
+    appendLogLines(importlog, rewrite.log);
     if (rewrite.outcome != CifRewrite::Outcome::Rewritten)
         return;
 

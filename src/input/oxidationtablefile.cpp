@@ -1,4 +1,5 @@
 #include "import.h"
+#include "logbatch.h"
 #include "logstyle.h"
 #include "oxidationtable.h"
 
@@ -16,8 +17,7 @@ void Import::readOxidationTable()
     // Latin-1 keeps every byte, so names match the CIF labels byte for byte.
     OxidationTableRead read = parseOxidationTable(QString::fromLatin1(file.readAll()));
     oxidationTable = std::move(read.entries);
-    for (const QString &line : std::as_const(read.log))
-        importlog->append(line);
+    appendLogLines(importlog, read.log);
 }
 
 OxidationEntry Import::entryForName(const QString &key) const

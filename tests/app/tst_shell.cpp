@@ -1,4 +1,5 @@
 #include "import.h"
+#include "logbatch.h"
 #include "testsupport.h"
 
 #include <QDialog>
@@ -17,6 +18,8 @@ private slots:
     void aboutClosesByEscape();
     void closeButtonClearsAndCloses();
     void escapeClosesLikeClose();
+    void longListsAreShortened_data();
+    void longListsAreShortened();
 };
 
 namespace {
@@ -133,6 +136,34 @@ void TestShell::escapeClosesLikeClose()
     dialog.cancelButton->setFocus();
     QTest::keyClick(&dialog, Qt::Key_Escape);
     QVERIFY(!dialog.isVisible());
+}
+
+void TestShell::longListsAreShortened_data()
+{
+    QTest::addColumn<int>("count");
+    QTest::addColumn<int>("paragraphs");
+    QTest::newRow("short list whole") << 3 << 3;
+    QTest::newRow("at the limit whole") << logListLimit << logListLimit;
+    QTest::newRow("long list cut in the middle") << logListLimit + 5001 << logListLimit + 1;
+}
+
+void TestShell::longListsAreShortened()
+{
+    QFETCH(int, count);
+    QFETCH(int, paragraphs);
+    QStringList lines;
+    for (int i = 0; i < count; ++i)
+        lines << QStringLiteral("Atom%1  X  1").arg(i);
+    QTextEdit log;
+    appendLogLines(&log, lines);
+    QStringList shown = logLines(&log);
+    shown.removeAll(QString()); // the left-out line stands between two line breaks
+    QCOMPARE(shown.size(), paragraphs);
+    QCOMPARE(shown.first(), lines.first());
+    QCOMPARE(shown.last(), lines.last());
+    if (count > logListLimit)
+        QCOMPARE(shown.at(logListLimit / 2),
+                 QStringLiteral("%1 more lines are not shown in the log. ").arg(count - logListLimit));
 }
 
 QTEST_MAIN(TestShell)
