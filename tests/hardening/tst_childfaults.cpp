@@ -199,10 +199,14 @@ void TestChildFaults::closeDuringRun()
     // As in main: Close ends the event loop, then the dialog goes.
     QTimer::singleShot(100, job.dlg->cancelButton, &QPushButton::click);
     bool loopEnded = true;
-    QTimer::singleShot(10000, qApp, [&] {
+    // A timer object of this scope: a pending single shot would fire in a later test.
+    QTimer guard;
+    guard.setSingleShot(true);
+    QObject::connect(&guard, &QTimer::timeout, [&] {
         loopEnded = false;
         QCoreApplication::quit();
     });
+    guard.start(10000);
     QApplication::exec();
     QVERIFY(loopEnded);
     QVERIFY(!job.dlg->isVisible());
