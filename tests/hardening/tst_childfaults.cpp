@@ -41,6 +41,29 @@ bool waitForJobEnd(Job &job, int timeoutMs = 60000)
     return runLoopUntil([&] { return job.idle() && !resultDisplayBusy(job.dlg->importlog); }, timeoutMs);
 }
 
+struct JobCost
+{
+    bool ended = false;
+    qint64 longestStopMs = 0;
+    qint64 peakGrowthKiB = 0;
+};
+
+// Presses Run and waits for the job's end, measuring the longest stop of the event loop and the
+// growth of the peak memory meanwhile.
+JobCost runMeasured(Job &job)
+{
+    LoopGapMeter meter;
+    resetPeakMemory();
+    const qint64 before = statusKiB("VmRSS");
+    job.dlg->importButton->click();
+    JobCost cost;
+    cost.ended = waitForJobEnd(job);
+    cost.peakGrowthKiB = statusKiB("VmHWM") - before;
+    cost.longestStopMs = meter.longestGapMs();
+    qInfo("longest stop %lld ms, peak memory growth %lld KiB", cost.longestStopMs, cost.peakGrowthKiB);
+    return cost;
+}
+
 // The run's lines up to the converter's start, as the log shows them.
 QStringList converterHead(const Job &job)
 {
@@ -103,17 +126,11 @@ void TestChildFaults::converterOutput()
     job.choose("in.cif", "DATA", 0);
     bytes.clear();
 
-    LoopGapMeter meter;
-    resetPeakMemory();
-    const qint64 before = statusKiB("VmRSS");
-    job.dlg->importButton->click();
-    QVERIFY(waitForJobEnd(job));
-    const qint64 peak = statusKiB("VmHWM") - before;
-    qInfo("longest stop %lld ms, peak memory growth %lld KiB", meter.longestGapMs(), peak);
-
-    QVERIFY2(meter.longestGapMs() < longestStopMs, qPrintable(QString::number(meter.longestGapMs())));
+    const JobCost cost = runMeasured(job);
+    QVERIFY(cost.ended);
+    QVERIFY2(cost.longestStopMs < longestStopMs, qPrintable(QString::number(cost.longestStopMs)));
     if (memoryFiguresHold)
-        QVERIFY2(peak < peakGrowthKiB, qPrintable(QString::number(peak)));
+        QVERIFY2(cost.peakGrowthKiB < peakGrowthKiB, qPrintable(QString::number(cost.peakGrowthKiB)));
     if (reportsError) {
         QVERIFY2(job.logEndsWith(converterHead(job) + errorSeen), qPrintable(job.text().right(500)));
         QCOMPARE(job.file("MORVEL.OUT"), QByteArray("<none>"));
@@ -245,17 +262,12 @@ void TestChildFaults::morvelResult()
     writeFile(job.work + "/MORVEL.OUT", "earlier");
     job.choose("in.txt", "input", 1);
 
-    LoopGapMeter meter;
-    resetPeakMemory();
-    const qint64 before = statusKiB("VmRSS");
-    job.dlg->importButton->click();
-    QVERIFY(waitForJobEnd(job));
-    const qint64 peak = statusKiB("VmHWM") - before;
-    qInfo("longest stop %lld ms, peak memory growth %lld KiB", meter.longestGapMs(), peak);
-    QVERIFY2(meter.longestGapMs() < longestStopMs, qPrintable(QString::number(meter.longestGapMs())));
+    const JobCost cost = runMeasured(job);
+    QVERIFY(cost.ended);
+    QVERIFY2(cost.longestStopMs < longestStopMs, qPrintable(QString::number(cost.longestStopMs)));
     // The log holds at most 10 MiB of a result; as laid-out text that is some ten times more.
     if (memoryFiguresHold)
-        QVERIFY2(peak < 4 * peakGrowthKiB, qPrintable(QString::number(peak)));
+        QVERIFY2(cost.peakGrowthKiB < 4 * peakGrowthKiB, qPrintable(QString::number(cost.peakGrowthKiB)));
 
     QCOMPARE(job.file("MORVEL.OUT.old1"), QByteArray("earlier"));
     QCOMPARE(job.file("MORVEL.OUT"), written.isNull() ? QByteArray("") : written);
