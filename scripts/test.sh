@@ -41,7 +41,7 @@ CC=clang CXX=clang++ cmake -S "$root" -B "$fuzzbuild" -DCMAKE_BUILD_TYPE=RelWith
       -DMORVEL_BUILD_TESTS=OFF -DMORVEL_BUILD_TOOLS=OFF -DMORVEL_BUILD_BENCH=OFF
 cmake --build "$fuzzbuild" -j"$jobs"
 for fuzzer in "$fuzzbuild"/fuzz/fuzz_*; do
-  [ -x "$fuzzer" ] || continue
+  [ -f "$fuzzer" ] && [ -x "$fuzzer" ] || continue
   name=$(basename "$fuzzer"); short=${name#fuzz_}
   corpus=$fuzzbuild/corpus/$short
   mkdir -p "$corpus"
