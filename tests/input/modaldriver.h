@@ -2,6 +2,7 @@
 #define MORVEL_MODALDRIVER_H
 
 #include <QApplication>
+#include <QElapsedTimer>
 #include <QFileDialog>
 #include <QMessageBox>
 #include <QPointer>
@@ -63,9 +64,20 @@ private:
     void poll()
     {
         QWidget *w = QApplication::activeModalWidget();
-        if (!w || !w->isVisible() || w == handled)
+        if (!w || !w->isVisible())
             return;
+        if (w == handled) {
+            // A window that stays open after its answer (a refused choice) would hang the test.
+            if (answeredAt.isValid() && answeredAt.elapsed() > 5000) {
+                answeredAt.invalidate();
+                problems.append(QLatin1String("still open after its answer: ") + w->metaObject()->className());
+                if (auto *dialog = qobject_cast<QDialog *>(w))
+                    dialog->reject();
+            }
+            return;
+        }
         handled = w;
+        answeredAt.start();
         if (steps.isEmpty())
             return unexpected(w);
         steps.takeFirst()(w);
@@ -80,6 +92,7 @@ private:
 
     QTimer timer;
     QPointer<QWidget> handled;
+    QElapsedTimer answeredAt;
     QList<std::function<void(QWidget *)>> steps;
 };
 
