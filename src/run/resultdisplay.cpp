@@ -1,5 +1,6 @@
 #include "resultdisplay.h"
 #include "resultdisplaytext.h"
+#include "stackedtextlayout.h"
 
 #include <QAbstractTextDocumentLayout>
 #include <QCoreApplication>
@@ -8,6 +9,7 @@
 #include <QFontMetricsF>
 #include <QPointer>
 #include <QScrollBar>
+#include <QSemaphore>
 #include <QTextBlock>
 #include <QTextCursor>
 #include <QTextDocument>
@@ -17,6 +19,7 @@
 #include <QTimer>
 
 #include <algorithm>
+#include <utility>
 
 using namespace ResultText;
 
@@ -129,44 +132,132 @@ int richCutPosition(QTextDocument *doc, int start, const LogGeometry &geometry)
     return std::max(cut, start);
 }
 
+// Whether lines joined into one paragraph look as they do in paragraphs of their own with this
+// format: nothing that applies once a paragraph may differ.
+bool linesMayShareParagraphs(const QTextBlockFormat &format)
+{
+    return format.topMargin() == 0 && format.bottomMargin() == 0 && format.textIndent() == 0
+           && format.marker() == QTextBlockFormat::MarkerType::NoMarker
+           && !format.hasProperty(QTextFormat::ObjectIndex);
+}
+
+// A result's text as the log will show it.
+struct PreparedResult
+{
+    QString text;
+    bool rich = false;
+    bool whole = true; // false: the log shows only the first part
+};
+
+PreparedResult prepareResult(const ResultSource &source, const AppendFormats &formats,
+                             const LogGeometry &geometry)
+{
+    PreparedResult result;
+    result.text = decodeResult(source.bytes, source.complete);
+    result.whole = source.complete;
+    result.rich = Qt::mightBeRichText(result.text);
+    if (!result.rich) {
+        const qsizetype shown = plainShownLength(result.text, geometry);
+        if (shown < result.text.size()) {
+            result.text.truncate(shown);
+            result.whole = false;
+        }
+        if (linesMayShareParagraphs(formats.block))
+            joinLines(result.text);
+    }
+    return result;
+}
+
+void appendTooLargeLine(QTextDocument *doc, const AppendFormats &formats, const ResultSource &source)
+{
+    appendHtml(doc, formats, tooLargeLine(source.path, std::max<qint64>(source.fileSize, source.bytes.size())));
+}
+
 // Appends the result to `doc` as one append of its whole text would, shortened to what the log
 // can take; a shortened result is followed by the line that says so.
-void appendResult(QTextDocument *doc, const AppendFormats &formats, const ResultSource &source,
-                  const LogGeometry &geometry)
+void appendPrepared(QTextDocument *doc, const AppendFormats &formats, PreparedResult &result,
+                    const ResultSource &source, const LogGeometry &geometry)
 {
-    QString text = decodeResult(source.bytes, source.complete);
-    bool whole = source.complete;
-    const bool rich = Qt::mightBeRichText(text);
-    if (!rich) {
-        const qsizetype shown = plainShownLength(text, geometry);
-        if (shown < text.size()) {
-            text.truncate(shown);
-            whole = false;
-        }
-    }
-
     QTextCursor cursor(doc);
     cursor.beginEditBlock();
     const int start = beginAppend(cursor, formats);
-    if (rich)
-        cursor.insertHtml(text);
+    if (result.rich)
+        cursor.insertHtml(result.text);
     else
-        cursor.insertText(text);
+        cursor.insertText(result.text);
     cursor.endEditBlock();
-    text.clear();
 
-    if (rich) {
+    if (result.rich) {
         const int cut = richCutPosition(doc, start, geometry);
         if (cut >= 0) {
             QTextCursor tail(doc);
             tail.setPosition(cut);
             tail.movePosition(QTextCursor::End, QTextCursor::KeepAnchor);
             tail.removeSelectedText();
-            whole = false;
+            result.whole = false;
         }
     }
-    if (!whole)
-        appendHtml(doc, formats, tooLargeLine(source.path, std::max<qint64>(source.fileSize, source.bytes.size())));
+    if (!result.whole)
+        appendTooLargeLine(doc, formats, source);
+}
+
+void appendResult(QTextDocument *doc, const AppendFormats &formats, const ResultSource &source,
+                  const LogGeometry &geometry)
+{
+    PreparedResult result = prepareResult(source, formats, geometry);
+    appendPrepared(doc, formats, result, source, geometry);
+}
+
+// Where a plain result is cut into two pieces laid out side by side: at a paragraph break a
+// little before the middle (the first piece also holds the log's earlier text and the whole
+// document is built after it), or -1 for no cut.
+qsizetype pieceBreak(const QString &text)
+{
+    const qsizetype at = text.indexOf(QLatin1Char('\n'), text.size() * 9 / 20);
+    if (at > 0 && text.at(at - 1) == QLatin1Char('\r'))
+        return at - 1;
+    return at;
+}
+
+// The same font, but not shared with other copies: a font caches its glyph engine for one thread
+// at a time, and two threads laying out text in fonts that share it would keep replacing it.
+QFont unsharedFont(const QFont &font)
+{
+    QFont own = font;
+    own.setStyleStrategy(font.styleStrategy()); // makes a copy of its own
+    own.setResolveMask(font.resolveMask());
+    return own;
+}
+
+// An empty document that lays text out as `doc` does.
+QTextDocument *emptyLike(const QTextDocument *doc)
+{
+    auto *piece = new QTextDocument;
+    piece->setUndoRedoEnabled(false);
+    piece->setDefaultFont(unsharedFont(doc->defaultFont()));
+    piece->setDefaultTextOption(doc->defaultTextOption());
+    piece->setIndentWidth(doc->indentWidth());
+    piece->setDocumentMargin(doc->documentMargin());
+    piece->rootFrame()->setFrameFormat(doc->rootFrame()->frameFormat());
+    piece->setBaseUrl(doc->baseUrl());
+    return piece;
+}
+
+// The width the editor will lay its text out at once it shows the result: with a vertical scroll
+// bar, which a result this large needs.
+qreal shownPageWidth(QTextEdit *log)
+{
+    int width = log->viewport()->width();
+    const QScrollBar *bar = log->verticalScrollBar();
+    if (!bar->isVisibleTo(log) && log->verticalScrollBarPolicy() != Qt::ScrollBarAlwaysOff)
+        width -= bar->sizeHint().width();
+    return std::max(width, 1);
+}
+
+void layOut(QTextDocument *doc, qreal pageWidth)
+{
+    doc->setPageSize(QSizeF(pageWidth, -1));
+    doc->documentLayout()->documentSize();
 }
 
 // Lets the scroll bars follow a layout finished outside the event loop (the layout itself would
@@ -229,8 +320,9 @@ void showNow(QTextEdit *log, const ResultSource &source)
 }
 
 // A larger result: the log's text with the result appended is built in a copy of the log's
-// document on a worker thread; the copy then replaces the log's document and is laid out in
-// slices from the event loop. Lives as a child of the log, so it never outlives it.
+// document on a worker thread; the copy then replaces the log's document. A plain result is also
+// laid out there, in two pieces on two threads at once (see StackedTextLayout); a rich one is laid
+// out in slices from the event loop. Lives as a child of the log, so it never outlives it.
 class ResultDisplayJob : public QObject
 {
 public:
@@ -241,6 +333,9 @@ public:
     void cancel();
 
 private:
+    void buildCopy();
+    void buildSecondPiece();
+    void workerFinished();
     void built();
     void layoutSlice();
     void finish();
@@ -248,19 +343,27 @@ private:
     QPointer<QTextEdit> m_log;
     QPointer<QTextDocument> m_logDocument; // the document the copy replaces
     QTextDocument *m_copy = nullptr;       // owned until handed to the log
+    QTextDocument *m_firstPiece = nullptr; // a plain result's pieces, owned until handed over
+    QTextDocument *m_secondPiece = nullptr;
     QPointer<QTextDocument> m_shown;       // the copy once it is the log's document
     QThread *m_worker = nullptr;
+    QThread *m_secondWorker = nullptr;
+    QSemaphore m_prepared;                 // the result's text is ready for the second worker
     QTimer m_layoutTimer;
     QMetaObject::Connection m_watch;
     ResultSource m_source;
+    PreparedResult m_result;
+    qsizetype m_pieceBreak = -1;
     AppendFormats m_formats;
     LogGeometry m_geometry;
+    qreal m_pageWidth = 0;
     QTextCharFormat m_editorCharFormat;
     int m_oldLength = 0;
     int m_cursorAnchor = 0;
     int m_cursorPosition = 0;
     int m_scrollValue = 0;
     int m_layoutPosition = 0;
+    int m_workersRunning = 2;
     bool m_atBottom = false;
     bool m_active = true;
 };
@@ -273,6 +376,7 @@ ResultDisplayJob::ResultDisplayJob(QTextEdit *log, ResultSource source)
     m_editorCharFormat = editorCursor.charFormat();
     m_formats = {editorCursor.blockFormat(), m_editorCharFormat};
     m_geometry = geometryOf(log);
+    m_pageWidth = shownPageWidth(log);
     m_atBottom = logAtBottom(log);
     m_scrollValue = log->verticalScrollBar()->value();
     m_cursorAnchor = editorCursor.anchor();
@@ -284,20 +388,24 @@ ResultDisplayJob::ResultDisplayJob(QTextEdit *log, ResultSource source)
     m_copy->setBaseUrl(doc->baseUrl());
     m_copy->setDefaultCursorMoveStyle(doc->defaultCursorMoveStyle());
     m_copy->setUndoRedoEnabled(false);
+    m_firstPiece = doc->clone();
+    m_firstPiece->setUndoRedoEnabled(false);
+    m_firstPiece->setDefaultFont(unsharedFont(doc->defaultFont()));
+    m_secondPiece = emptyLike(doc);
 
     // Anyone else changing the log meanwhile makes the copy stale: the display then gives way.
     m_watch = connect(doc, &QTextDocument::contentsChange, this, [this] { cancel(); });
 
-    QThread *gui = thread();
-    m_worker = QThread::create([this, gui] {
-        appendResult(m_copy, m_formats, m_source, m_geometry);
-        m_source.bytes = QByteArray();
-        m_copy->moveToThread(gui);
-    });
-    // The copy's frames and lists are created by the worker: they must belong to its thread.
+    m_worker = QThread::create([this] { buildCopy(); });
+    m_secondWorker = QThread::create([this] { buildSecondPiece(); });
+    // Documents get frames and lists from the thread that builds them: they must belong to it.
     m_copy->moveToThread(m_worker);
-    connect(m_worker, &QThread::finished, this, [this] { built(); });
-    m_worker->start();
+    m_firstPiece->moveToThread(m_worker);
+    m_secondPiece->moveToThread(m_secondWorker);
+    for (QThread *worker : {m_worker, m_secondWorker}) {
+        connect(worker, &QThread::finished, this, [this] { workerFinished(); });
+        worker->start();
+    }
 
     m_layoutTimer.setInterval(0);
     connect(&m_layoutTimer, &QTimer::timeout, this, [this] { layoutSlice(); });
@@ -305,11 +413,78 @@ ResultDisplayJob::ResultDisplayJob(QTextEdit *log, ResultSource source)
 
 ResultDisplayJob::~ResultDisplayJob()
 {
-    if (m_worker) {
-        m_worker->wait();
-        delete m_worker;
+    m_prepared.release(); // a second worker never waits for a first that is gone
+    for (QThread *worker : {m_worker, m_secondWorker}) {
+        if (worker) {
+            worker->wait();
+            delete worker;
+        }
     }
     delete m_copy;
+    delete m_firstPiece;
+    delete m_secondPiece;
+}
+
+// First worker: the text, then for a plain result the first piece, laid out; then the copy.
+void ResultDisplayJob::buildCopy()
+{
+    QThread *gui = thread();
+    m_result = prepareResult(m_source, m_formats, m_geometry);
+    const bool plain = !m_result.rich;
+    if (plain && linesMayShareParagraphs(m_formats.block))
+        m_pieceBreak = pieceBreak(m_result.text);
+    m_prepared.release();
+
+    if (plain) {
+        const bool last = m_pieceBreak < 0;
+        QTextCursor cursor(m_firstPiece);
+        cursor.beginEditBlock();
+        beginAppend(cursor, m_formats);
+        cursor.insertText(last ? m_result.text : m_result.text.left(m_pieceBreak));
+        cursor.endEditBlock();
+        if (last && !m_result.whole)
+            appendTooLargeLine(m_firstPiece, m_formats, m_source);
+        layOut(m_firstPiece, m_pageWidth);
+        m_firstPiece->moveToThread(gui);
+        m_copy->setPageSize(QSizeF(m_pageWidth, -1));
+    } else {
+        delete m_firstPiece;
+        m_firstPiece = nullptr;
+    }
+    appendPrepared(m_copy, m_formats, m_result, m_source, m_geometry);
+    m_result.text = QString();
+    m_source.bytes = QByteArray();
+    m_copy->moveToThread(gui);
+}
+
+// Second worker: the rest of a plain result after the break, laid out.
+void ResultDisplayJob::buildSecondPiece()
+{
+    m_prepared.acquire();
+    if (m_result.rich || m_pieceBreak < 0 || !m_active) {
+        delete m_secondPiece;
+        m_secondPiece = nullptr;
+        return;
+    }
+    const qsizetype breakLength = m_result.text.at(m_pieceBreak) == QLatin1Char('\r') ? 2 : 1;
+    QTextCursor cursor(m_secondPiece);
+    cursor.beginEditBlock();
+    // The paragraph the break opens, as typing the break in the copy makes it.
+    cursor.setBlockFormat(m_formats.block);
+    cursor.setBlockCharFormat(m_formats.chars);
+    cursor.setCharFormat(m_formats.chars);
+    cursor.insertText(m_result.text.mid(m_pieceBreak + breakLength));
+    cursor.endEditBlock();
+    if (!m_result.whole)
+        appendTooLargeLine(m_secondPiece, m_formats, m_source);
+    layOut(m_secondPiece, m_pageWidth);
+    m_secondPiece->moveToThread(thread());
+}
+
+void ResultDisplayJob::workerFinished()
+{
+    if (--m_workersRunning == 0)
+        built();
 }
 
 void ResultDisplayJob::cancel()
@@ -320,15 +495,17 @@ void ResultDisplayJob::cancel()
     disconnect(m_watch);
     m_layoutTimer.stop();
     // A worker still running cannot be stopped; built() drops its copy when it is done.
-    if (!m_worker)
+    if (m_workersRunning == 0)
         deleteLater();
 }
 
 void ResultDisplayJob::built()
 {
-    m_worker->wait();
-    delete m_worker;
-    m_worker = nullptr;
+    for (QThread **worker : {&m_worker, &m_secondWorker}) {
+        (*worker)->wait();
+        delete *worker;
+        *worker = nullptr;
+    }
     if (!m_active || !m_log || !m_logDocument || m_log->document() != m_logDocument) {
         m_active = false;
         deleteLater();
@@ -336,8 +513,14 @@ void ResultDisplayJob::built()
     }
     disconnect(m_watch);
 
-    QTextDocument *copy = m_copy;
-    m_copy = nullptr;
+    QTextDocument *copy = std::exchange(m_copy, nullptr);
+    if (m_firstPiece) {
+        QList<QTextDocument *> pieces{std::exchange(m_firstPiece, nullptr)};
+        if (m_secondPiece)
+            pieces.append(std::exchange(m_secondPiece, nullptr));
+        // Pieces that do not add up to the copy are dropped: it is then laid out as usual.
+        StackedTextLayout::install(copy, pieces);
+    }
     copy->setUndoRedoEnabled(m_logDocument->isUndoRedoEnabled());
     // Owned as the document it replaces was: the editor deletes that one if it owned it.
     copy->setParent(m_logDocument->parent());
@@ -363,6 +546,7 @@ void ResultDisplayJob::layoutSlice()
         return;
     }
     // Lay out up to a position at a time, for about a frame's time per turn of the event loop.
+    // (Text laid out on the workers already is only looked up.)
     constexpr int step = 8192;
     constexpr qint64 sliceMs = 40;
     QTextDocument *doc = m_shown;

@@ -65,6 +65,87 @@ qsizetype plainShownLength(const QString &text, const LogGeometry &geometry, dou
     return size;
 }
 
+namespace {
+
+// Whether a line of this text could take a different direction than the one before it.
+bool hasDirectionalText(const QString &text)
+{
+    const qsizetype size = text.size();
+    const QChar *data = text.constData();
+    for (qsizetype i = 0; i < size; ++i) {
+        char32_t c = data[i].unicode();
+        if (c < 0x0590)
+            continue; // below Hebrew, every letter is left-to-right
+        if (QChar::isHighSurrogate(c) && i + 1 < size && data[i + 1].isLowSurrogate()) {
+            c = QChar::surrogateToUcs4(data[i].unicode(), data[i + 1].unicode());
+            ++i;
+        }
+        switch (QChar::direction(c)) {
+        case QChar::DirR:
+        case QChar::DirAL:
+        case QChar::DirAN:
+        case QChar::DirRLE:
+        case QChar::DirRLO:
+        case QChar::DirLRE:
+        case QChar::DirLRO:
+        case QChar::DirPDF:
+        case QChar::DirRLI:
+        case QChar::DirLRI:
+        case QChar::DirFSI:
+        case QChar::DirPDI:
+            return true;
+        default:
+            break;
+        }
+    }
+    return false;
+}
+
+bool isParagraphBreak(char16_t c)
+{
+    return c == u'\n' || c == u'\r' || c == QChar::ParagraphSeparator || c == 0xfdd0 || c == 0xfdd1;
+}
+
+} // namespace
+
+bool joinLines(QString &text, qsizetype paragraphChars)
+{
+    if (hasDirectionalText(text))
+        return false;
+    // The breaks that stay: the last one (the text's end stays an empty paragraph, as in the
+    // log), frame marks, and the first break after paragraphChars characters.
+    qsizetype lastBreak = text.size() - 1;
+    while (lastBreak >= 0 && !isParagraphBreak(text.at(lastBreak).unicode()))
+        --lastBreak;
+    if (lastBreak > 0 && text.at(lastBreak) == u'\n' && text.at(lastBreak - 1) == u'\r')
+        --lastBreak;
+
+    QChar *data = text.data();
+    const qsizetype size = text.size();
+    qsizetype out = 0;
+    qsizetype paragraphStart = 0;
+    bool joined = false;
+    for (qsizetype in = 0; in < size; ++in) {
+        const char16_t c = data[in].unicode();
+        if (!isParagraphBreak(c)) {
+            data[out++] = data[in];
+            continue;
+        }
+        const qsizetype breakLength = c == u'\r' && in + 1 < size && data[in + 1] == u'\n' ? 2 : 1;
+        if (c == 0xfdd0 || c == 0xfdd1 || in >= lastBreak || out - paragraphStart >= paragraphChars) {
+            for (qsizetype k = 0; k < breakLength; ++k)
+                data[out++] = data[in + k];
+            paragraphStart = out;
+        } else {
+            data[out++] = QChar::LineSeparator;
+            joined = true;
+        }
+        in += breakLength - 1;
+    }
+    text.truncate(out);
+    return joined;
+}
+
 QString tooLargeLine(const QString &path, qint64 fileSize)
 {
     return LogStyle::error(

@@ -39,6 +39,15 @@ double paragraphHeight(qsizetype chars, qsizetype lineBreaks, const LogGeometry 
 qsizetype plainShownLength(const QString &text, const LogGeometry &geometry,
                            double heightBefore = 0.0);
 
+// The log lays out a plain text paragraph by paragraph, and each paragraph costs far more than
+// its characters. Joins the lines of a result into paragraphs of at least `paragraphChars`
+// characters with line separators, which the log shows exactly as it shows one paragraph a line
+// (same lines, same heights, the same plain text) when the paragraphs' format has no margins,
+// indent or list. Text with right-to-left letters or explicit direction marks is left as it is:
+// there a paragraph's direction would carry over from one line to the next. The last line break
+// stays a paragraph break. Returns whether anything was joined.
+bool joinLines(QString &text, qsizetype paragraphChars = 4096);
+
 // The log entry (error style) that follows a result shown only in part.
 QString tooLargeLine(const QString &path, qint64 fileSize);
 

@@ -8,6 +8,8 @@ list(APPEND MORVEL_RUN_DIALOG
   ${CMAKE_CURRENT_LIST_DIR}/childprocess.cpp
   ${CMAKE_CURRENT_LIST_DIR}/resultdisplay.h
   ${CMAKE_CURRENT_LIST_DIR}/resultdisplay.cpp
+  ${CMAKE_CURRENT_LIST_DIR}/stackedtextlayout.h
+  ${CMAKE_CURRENT_LIST_DIR}/stackedtextlayout.cpp
   ${CMAKE_CURRENT_LIST_DIR}/parameterfile.cpp
   ${CMAKE_CURRENT_LIST_DIR}/inputstaging.cpp
   ${CMAKE_CURRENT_LIST_DIR}/runcontroller.cpp

@@ -1,0 +1,301 @@
+#include "stackedtextlayout.h"
+
+#include <QPainter>
+#include <QTextBlock>
+#include <QTextCursor>
+#include <QTextDocument>
+#include <QTextDocumentFragment>
+#include <QTextFrame>
+
+#include <algorithm>
+#include <utility>
+
+namespace {
+
+qreal topInset(const QTextDocument *doc)
+{
+    const QTextFrameFormat format = doc->rootFrame()->frameFormat();
+    return format.topMargin() + format.border() + format.padding();
+}
+
+qreal bottomInset(const QTextDocument *doc)
+{
+    const QTextFrameFormat format = doc->rootFrame()->frameFormat();
+    return format.bottomMargin() + format.border() + format.padding();
+}
+
+bool sameOption(const QTextOption &a, const QTextOption &b)
+{
+    return a.alignment() == b.alignment() && a.wrapMode() == b.wrapMode() && a.flags() == b.flags()
+           && a.textDirection() == b.textDirection() && a.tabStopDistance() == b.tabStopDistance()
+           && a.tabArray() == b.tabArray() && a.useDesignMetrics() == b.useDesignMetrics();
+}
+
+// A text layout remembers the last glyph engine it used, and engines belong to the thread that
+// made them: they are gone with a worker thread that laid the piece out. Setting the layout's
+// font (not used for text in a document, which has formats) makes it forget the engine.
+void forgetGlyphEngines(QTextDocument *piece)
+{
+    const QFont font = piece->defaultFont();
+    for (QTextBlock block = piece->begin(); block.isValid(); block = block.next())
+        block.layout()->setFont(font);
+}
+
+// Small documents are laid out at once when the layout starts over; larger ones lazily, as the
+// editor does it.
+constexpr int layoutAtOnceChars = 256 * 1024;
+
+} // namespace
+
+StackedTextLayout::StackedTextLayout(QTextDocument *doc) : QAbstractTextDocumentLayout(doc) {}
+
+StackedTextLayout *StackedTextLayout::install(QTextDocument *doc, QList<QTextDocument *> pieces)
+{
+    int characters = 0;
+    int blocks = 0;
+    for (const QTextDocument *piece : std::as_const(pieces)) {
+        characters += piece->characterCount();
+        blocks += piece->blockCount();
+    }
+    // Pieces meet where the document has a paragraph separator; each piece ends with one of its own.
+    if (pieces.isEmpty() || characters != doc->characterCount() || blocks != doc->blockCount()) {
+        qDeleteAll(pieces);
+        return nullptr;
+    }
+    auto *layout = new StackedTextLayout(doc);
+    for (QTextDocument *piece : std::as_const(pieces)) {
+        forgetGlyphEngines(piece);
+        layout->adopt(piece, piece->documentLayout()->documentSize());
+    }
+    layout->restack();
+    doc->setDocumentLayout(layout);
+    // Only from now on: installing announces the whole text as new.
+    connect(doc, &QTextDocument::contentsChange, layout, [layout] { layout->m_editPending = true; });
+    return layout;
+}
+
+void StackedTextLayout::adopt(QTextDocument *piece, const QSizeF &size)
+{
+    Piece entry;
+    entry.doc = piece;
+    entry.size = size;
+    if (!m_pieces.isEmpty()) {
+        const Piece &before = m_pieces.last();
+        entry.position = before.position + before.doc->characterCount();
+        entry.block = before.block + before.doc->blockCount();
+    }
+    piece->setParent(this);
+    m_pieces.append(entry);
+
+    QAbstractTextDocumentLayout *layout = piece->documentLayout();
+    connect(layout, &QAbstractTextDocumentLayout::documentSizeChanged, this, [this, piece](const QSizeF &newSize) {
+        for (Piece &p : m_pieces) {
+            if (p.doc == piece && p.size != newSize) {
+                p.size = newSize;
+                restack();
+                emit documentSizeChanged(documentSize());
+            }
+        }
+    });
+    connect(layout, &QAbstractTextDocumentLayout::update, this, [this, piece](const QRectF &rect) {
+        for (const Piece &p : std::as_const(m_pieces)) {
+            if (p.doc == piece)
+                emit update(rect.translated(0, p.top));
+        }
+    });
+    connect(layout, &QAbstractTextDocumentLayout::updateBlock, this, [this, piece](const QTextBlock &block) {
+        for (const Piece &p : std::as_const(m_pieces)) {
+            if (p.doc == piece)
+                emit updateBlock(document()->findBlockByNumber(p.block + block.blockNumber()));
+        }
+    });
+}
+
+void StackedTextLayout::restack()
+{
+    for (qsizetype k = 1; k < m_pieces.size(); ++k) {
+        const Piece &before = m_pieces.at(k - 1);
+        m_pieces[k].top = before.top + before.size.height() - bottomInset(before.doc)
+                          - topInset(m_pieces.at(k).doc);
+    }
+}
+
+int StackedTextLayout::pieceAtPosition(int position) const
+{
+    int k = int(m_pieces.size()) - 1;
+    while (k > 0 && m_pieces.at(k).position > position)
+        --k;
+    return k;
+}
+
+int StackedTextLayout::pieceAtBlock(int blockNumber) const
+{
+    int k = int(m_pieces.size()) - 1;
+    while (k > 0 && m_pieces.at(k).block > blockNumber)
+        --k;
+    return k;
+}
+
+int StackedTextLayout::pieceAtY(qreal y) const
+{
+    int k = int(m_pieces.size()) - 1;
+    while (k > 0 && m_pieces.at(k).top + topInset(m_pieces.at(k).doc) > y)
+        --k;
+    return k;
+}
+
+void StackedTextLayout::draw(QPainter *painter, const PaintContext &context)
+{
+    const QVariant cursorWidth = property("cursorWidth");
+    for (const Piece &piece : std::as_const(m_pieces)) {
+        const QRectF area(0, piece.top, std::max(piece.size.width(), 1e9), piece.size.height());
+        if (context.clip.isValid() && !context.clip.intersects(area))
+            continue;
+        const int length = piece.doc->characterCount();
+        PaintContext local;
+        local.palette = context.palette;
+        local.clip = context.clip.isValid() ? context.clip.translated(0, -piece.top) : context.clip;
+        const int cursor = context.cursorPosition - piece.position;
+        local.cursorPosition = context.cursorPosition >= 0 && cursor >= 0 && cursor < length ? cursor : -1;
+        for (const Selection &selection : context.selections) {
+            const int start = selection.cursor.selectionStart() - piece.position;
+            const int end = selection.cursor.selectionEnd() - piece.position;
+            if (end < 0 || start >= length)
+                continue;
+            QTextCursor mapped(piece.doc);
+            mapped.setPosition(std::clamp(selection.cursor.anchor() - piece.position, 0, length - 1));
+            mapped.setPosition(std::clamp(selection.cursor.position() - piece.position, 0, length - 1),
+                               QTextCursor::KeepAnchor);
+            local.selections.append({mapped, selection.format});
+        }
+        QAbstractTextDocumentLayout *layout = piece.doc->documentLayout();
+        if (cursorWidth.isValid())
+            layout->setProperty("cursorWidth", cursorWidth);
+        painter->save();
+        painter->translate(0, piece.top);
+        layout->draw(painter, local);
+        painter->restore();
+    }
+}
+
+int StackedTextLayout::hitTest(const QPointF &point, Qt::HitTestAccuracy accuracy) const
+{
+    const Piece &piece = m_pieces.at(pieceAtY(point.y()));
+    const int position = piece.doc->documentLayout()->hitTest(point - QPointF(0, piece.top), accuracy);
+    return position < 0 ? -1 : piece.position + position;
+}
+
+int StackedTextLayout::pageCount() const
+{
+    return 1;
+}
+
+QSizeF StackedTextLayout::documentSize() const
+{
+    qreal width = 0;
+    for (const Piece &piece : m_pieces)
+        width = std::max(width, piece.size.width());
+    const Piece &last = m_pieces.last();
+    return QSizeF(width, last.top + last.size.height());
+}
+
+QRectF StackedTextLayout::frameBoundingRect(QTextFrame *frame) const
+{
+    if (!frame || frame == document()->rootFrame())
+        return QRectF(QPointF(0, 0), documentSize());
+    const Piece &piece = m_pieces.at(pieceAtPosition(frame->firstPosition()));
+    const int first = frame->firstPosition() - piece.position;
+    QTextFrame *inPiece = piece.doc->frameAt(first);
+    while (inPiece && inPiece->firstPosition() != first)
+        inPiece = inPiece->parentFrame();
+    if (!inPiece)
+        return QRectF();
+    return piece.doc->documentLayout()->frameBoundingRect(inPiece).translated(0, piece.top);
+}
+
+QRectF StackedTextLayout::blockBoundingRect(const QTextBlock &block) const
+{
+    if (!block.isValid())
+        return QRectF();
+    const Piece &piece = m_pieces.at(pieceAtBlock(block.blockNumber()));
+    const QTextBlock inPiece = piece.doc->findBlockByNumber(block.blockNumber() - piece.block);
+    if (!inPiece.isValid())
+        return QRectF();
+    return piece.doc->documentLayout()->blockBoundingRect(inPiece).translated(0, piece.top);
+}
+
+void StackedTextLayout::documentChanged(int from, int charsRemoved, int charsAdded)
+{
+    const Piece &last = m_pieces.last();
+    const bool textChanged = std::exchange(m_editPending, false)
+                             || last.position + last.doc->characterCount() != document()->characterCount();
+    if (!textChanged) {
+        scheduleFollowSettings();
+        return;
+    }
+    if (charsRemoved > 0 || !appendToLastPiece(from, charsAdded))
+        startOver();
+    restack();
+    emit documentSizeChanged(documentSize());
+    emit update();
+}
+
+bool StackedTextLayout::appendToLastPiece(int from, int charsAdded)
+{
+    Piece &last = m_pieces.last();
+    QTextDocument *doc = document();
+    if (from < last.position || from - last.position >= last.doc->characterCount())
+        return false;
+    QTextCursor source(doc);
+    source.setPosition(from);
+    source.setPosition(from + charsAdded, QTextCursor::KeepAnchor);
+    QTextCursor target(last.doc);
+    target.setPosition(from - last.position);
+    target.insertFragment(QTextDocumentFragment(source));
+    if (last.position + last.doc->characterCount() != doc->characterCount()
+        || last.block + last.doc->blockCount() != doc->blockCount())
+        return false;
+    // The piece has laid the new text out already; its size is known without waiting.
+    last.size = last.doc->documentLayout()->documentSize();
+    return true;
+}
+
+void StackedTextLayout::startOver()
+{
+    QList<Piece> old = std::exchange(m_pieces, {});
+    QTextDocument *copy = document()->clone();
+    const bool now = copy->characterCount() <= layoutAtOnceChars;
+    adopt(copy, now ? copy->documentLayout()->documentSize() : QSizeF(0, 0));
+    for (const Piece &piece : old)
+        delete piece.doc;
+}
+
+void StackedTextLayout::scheduleFollowSettings()
+{
+    // The editor tries out widths while it decides about its scroll bars; only the last one counts.
+    if (!m_followPending) {
+        m_followPending = true;
+        QMetaObject::invokeMethod(this, [this] {
+            m_followPending = false;
+            followSettings();
+        }, Qt::QueuedConnection);
+    }
+}
+
+void StackedTextLayout::followSettings()
+{
+    const QTextDocument *doc = document();
+    for (const Piece &piece : std::as_const(m_pieces)) {
+        QTextDocument *p = piece.doc;
+        if (p->defaultFont() != doc->defaultFont())
+            p->setDefaultFont(doc->defaultFont());
+        if (!sameOption(p->defaultTextOption(), doc->defaultTextOption()))
+            p->setDefaultTextOption(doc->defaultTextOption());
+        if (p->indentWidth() != doc->indentWidth())
+            p->setIndentWidth(doc->indentWidth());
+        if (p->pageSize() != doc->pageSize())
+            p->setPageSize(doc->pageSize());
+    }
+    restack();
+    emit documentSizeChanged(documentSize());
+}

@@ -1,0 +1,65 @@
+#ifndef MORVEL_STACKEDTEXTLAYOUT_H
+#define MORVEL_STACKEDTEXTLAYOUT_H
+
+#include <QAbstractTextDocumentLayout>
+#include <QList>
+#include <QSizeF>
+
+// Lays a document out as a stack of pieces: copies of consecutive parts of its text, each laid out
+// by Qt's own document layout in a document of its own. Pieces can be laid out on several threads
+// at once before they are stacked, which is what makes a very long log quick to show; what the
+// editor draws is what Qt's layout draws for each piece.
+//
+// Every piece after the first starts at a paragraph start of the document, and where two pieces
+// meet the paragraphs have no margins, so that stacking them gives the heights one layout would.
+// New text added at the end goes into the last piece; any other change of the text makes the
+// layout start over with one piece, a copy of the whole document.
+class StackedTextLayout : public QAbstractTextDocumentLayout
+{
+    Q_OBJECT
+
+public:
+    // Installs the layout on `doc` when the pieces hold its text, taking them over, and returns it;
+    // returns nullptr (and deletes the pieces) when they do not. The pieces must live in doc's
+    // thread now; they may have been laid out on other threads, which may have ended.
+    static StackedTextLayout *install(QTextDocument *doc, QList<QTextDocument *> pieces);
+
+    void draw(QPainter *painter, const PaintContext &context) override;
+    int hitTest(const QPointF &point, Qt::HitTestAccuracy accuracy) const override;
+    int pageCount() const override;
+    QSizeF documentSize() const override;
+    QRectF frameBoundingRect(QTextFrame *frame) const override;
+    QRectF blockBoundingRect(const QTextBlock &block) const override;
+
+    int pieceCount() const { return int(m_pieces.size()); }
+
+protected:
+    void documentChanged(int from, int charsRemoved, int charsAdded) override;
+
+private:
+    struct Piece
+    {
+        QTextDocument *doc = nullptr;
+        int position = 0; // of its first character in the document
+        int block = 0;    // number of its first block in the document
+        QSizeF size;      // as its layout last reported it
+        qreal top = 0;    // where its own origin lies in the document
+    };
+
+    explicit StackedTextLayout(QTextDocument *doc);
+    void adopt(QTextDocument *piece, const QSizeF &size);
+    void restack();
+    void startOver();
+    bool appendToLastPiece(int from, int charsAdded);
+    void scheduleFollowSettings();
+    void followSettings();
+    int pieceAtPosition(int position) const;
+    int pieceAtBlock(int blockNumber) const;
+    int pieceAtY(qreal y) const;
+
+    QList<Piece> m_pieces;
+    bool m_editPending = false;   // the document announced a change of its text
+    bool m_followPending = false; // a change of page size or font is still to be passed on
+};
+
+#endif
