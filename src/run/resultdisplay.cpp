@@ -168,9 +168,9 @@ PreparedResult prepareResult(const ResultSource &source, const AppendFormats &fo
     return result;
 }
 
-void appendTooLargeLine(QTextDocument *doc, const AppendFormats &formats, const ResultSource &source)
+QString tooLargeLineFor(const ResultSource &source)
 {
-    appendHtml(doc, formats, tooLargeLine(source.path, std::max<qint64>(source.fileSize, source.bytes.size())));
+    return tooLargeLine(source.path, std::max<qint64>(source.fileSize, source.bytes.size()));
 }
 
 // Appends the result to `doc` as one append of its whole text would, shortened to what the log
@@ -198,7 +198,7 @@ void appendPrepared(QTextDocument *doc, const AppendFormats &formats, PreparedRe
         }
     }
     if (!result.whole)
-        appendTooLargeLine(doc, formats, source);
+        appendHtml(doc, formats, tooLargeLineFor(source));
 }
 
 void appendResult(QTextDocument *doc, const AppendFormats &formats, const ResultSource &source,
@@ -348,12 +348,14 @@ private:
     QPointer<QTextDocument> m_shown;       // the copy once it is the log's document
     QThread *m_worker = nullptr;
     QThread *m_secondWorker = nullptr;
-    QSemaphore m_prepared;                 // the result's text is ready for the second worker
+    QSemaphore m_prepared;                 // the second worker's text is ready
+    bool m_hasSecondPiece = false;
+    QString m_secondText;                  // what the second piece shows
+    QString m_secondEndLine;               // and the line after it
     QTimer m_layoutTimer;
     QMetaObject::Connection m_watch;
     ResultSource m_source;
     PreparedResult m_result;
-    qsizetype m_pieceBreak = -1;
     AppendFormats m_formats;
     LogGeometry m_geometry;
     qreal m_pageWidth = 0;
@@ -413,7 +415,6 @@ ResultDisplayJob::ResultDisplayJob(QTextEdit *log, ResultSource source)
 
 ResultDisplayJob::~ResultDisplayJob()
 {
-    m_prepared.release(); // a second worker never waits for a first that is gone
     for (QThread *worker : {m_worker, m_secondWorker}) {
         if (worker) {
             worker->wait();
@@ -431,19 +432,27 @@ void ResultDisplayJob::buildCopy()
     QThread *gui = thread();
     m_result = prepareResult(m_source, m_formats, m_geometry);
     const bool plain = !m_result.rich;
-    if (plain && linesMayShareParagraphs(m_formats.block))
-        m_pieceBreak = pieceBreak(m_result.text);
+    // Pieces meet at a paragraph break; paragraphs with margins would not meet as in one layout.
+    const qsizetype cut = plain && linesMayShareParagraphs(m_formats.block) ? pieceBreak(m_result.text) : -1;
+    const QString endLine = m_result.whole ? QString() : tooLargeLineFor(m_source);
+    if (cut >= 0) {
+        const qsizetype breakLength = m_result.text.at(cut) == QLatin1Char('\r') ? 2 : 1;
+        m_secondText = m_result.text.mid(cut + breakLength);
+        m_secondEndLine = endLine;
+        m_hasSecondPiece = true;
+    }
     m_prepared.release();
 
     if (plain) {
-        const bool last = m_pieceBreak < 0;
         QTextCursor cursor(m_firstPiece);
         cursor.beginEditBlock();
         beginAppend(cursor, m_formats);
-        cursor.insertText(last ? m_result.text : m_result.text.left(m_pieceBreak));
+        cursor.insertText(cut < 0 ? m_result.text : m_result.text.left(cut));
         cursor.endEditBlock();
-        if (last && !m_result.whole)
-            appendTooLargeLine(m_firstPiece, m_formats, m_source);
+        if (cut < 0 && !endLine.isEmpty())
+            appendHtml(m_firstPiece, m_formats, endLine);
+        if (cut >= 0)
+            StackedTextLayout::closePiece(m_firstPiece);
         layOut(m_firstPiece, m_pageWidth);
         m_firstPiece->moveToThread(gui);
         m_copy->setPageSize(QSizeF(m_pageWidth, -1));
@@ -457,26 +466,27 @@ void ResultDisplayJob::buildCopy()
     m_copy->moveToThread(gui);
 }
 
-// Second worker: the rest of a plain result after the break, laid out.
+// Second worker: the rest of a plain result after the break, laid out. Uses only what the first
+// worker set before it let this one go, and what nobody changes.
 void ResultDisplayJob::buildSecondPiece()
 {
     m_prepared.acquire();
-    if (m_result.rich || m_pieceBreak < 0 || !m_active) {
+    if (!m_hasSecondPiece) {
         delete m_secondPiece;
         m_secondPiece = nullptr;
         return;
     }
-    const qsizetype breakLength = m_result.text.at(m_pieceBreak) == QLatin1Char('\r') ? 2 : 1;
     QTextCursor cursor(m_secondPiece);
     cursor.beginEditBlock();
     // The paragraph the break opens, as typing the break in the copy makes it.
     cursor.setBlockFormat(m_formats.block);
     cursor.setBlockCharFormat(m_formats.chars);
     cursor.setCharFormat(m_formats.chars);
-    cursor.insertText(m_result.text.mid(m_pieceBreak + breakLength));
+    cursor.insertText(m_secondText);
     cursor.endEditBlock();
-    if (!m_result.whole)
-        appendTooLargeLine(m_secondPiece, m_formats, m_source);
+    m_secondText = QString();
+    if (!m_secondEndLine.isEmpty())
+        appendHtml(m_secondPiece, m_formats, m_secondEndLine);
     layOut(m_secondPiece, m_pageWidth);
     m_secondPiece->moveToThread(thread());
 }

@@ -49,15 +49,26 @@ constexpr int layoutAtOnceChars = 256 * 1024;
 
 StackedTextLayout::StackedTextLayout(QTextDocument *doc) : QAbstractTextDocumentLayout(doc) {}
 
+void StackedTextLayout::closePiece(QTextDocument *piece)
+{
+    QTextCursor cursor(piece);
+    cursor.movePosition(QTextCursor::End);
+    QTextBlockFormat nothing;
+    nothing.setLineHeight(0, QTextBlockFormat::FixedHeight);
+    cursor.insertBlock(nothing);
+}
+
 StackedTextLayout *StackedTextLayout::install(QTextDocument *doc, QList<QTextDocument *> pieces)
 {
+    // Where two pieces meet, the document has a paragraph separator; the first piece has it too,
+    // followed by the paragraph closePiece added.
     int characters = 0;
     int blocks = 0;
     for (const QTextDocument *piece : std::as_const(pieces)) {
-        characters += piece->characterCount();
-        blocks += piece->blockCount();
+        const int closing = piece == pieces.last() ? 0 : 1;
+        characters += piece->characterCount() - closing;
+        blocks += piece->blockCount() - closing;
     }
-    // Pieces meet where the document has a paragraph separator; each piece ends with one of its own.
     if (pieces.isEmpty() || characters != doc->characterCount() || blocks != doc->blockCount()) {
         qDeleteAll(pieces);
         return nullptr;
@@ -81,8 +92,8 @@ void StackedTextLayout::adopt(QTextDocument *piece, const QSizeF &size)
     entry.size = size;
     if (!m_pieces.isEmpty()) {
         const Piece &before = m_pieces.last();
-        entry.position = before.position + before.doc->characterCount();
-        entry.block = before.block + before.doc->blockCount();
+        entry.position = before.position + before.doc->characterCount() - 1;
+        entry.block = before.block + before.doc->blockCount() - 1;
     }
     piece->setParent(this);
     m_pieces.append(entry);
@@ -120,6 +131,13 @@ void StackedTextLayout::restack()
     }
 }
 
+// One past the last document position that piece k shows.
+int StackedTextLayout::pieceEnd(int k) const
+{
+    const Piece &piece = m_pieces.at(k);
+    return k + 1 < m_pieces.size() ? m_pieces.at(k + 1).position : piece.position + piece.doc->characterCount();
+}
+
 int StackedTextLayout::pieceAtPosition(int position) const
 {
     int k = int(m_pieces.size()) - 1;
@@ -147,20 +165,24 @@ int StackedTextLayout::pieceAtY(qreal y) const
 void StackedTextLayout::draw(QPainter *painter, const PaintContext &context)
 {
     const QVariant cursorWidth = property("cursorWidth");
-    for (const Piece &piece : std::as_const(m_pieces)) {
+    for (int k = 0; k < m_pieces.size(); ++k) {
+        const Piece &piece = m_pieces.at(k);
         const QRectF area(0, piece.top, std::max(piece.size.width(), 1e9), piece.size.height());
         if (context.clip.isValid() && !context.clip.intersects(area))
             continue;
         const int length = piece.doc->characterCount();
+        const int shown = pieceEnd(k) - piece.position;
         PaintContext local;
         local.palette = context.palette;
         local.clip = context.clip.isValid() ? context.clip.translated(0, -piece.top) : context.clip;
         const int cursor = context.cursorPosition - piece.position;
-        local.cursorPosition = context.cursorPosition >= 0 && cursor >= 0 && cursor < length ? cursor : -1;
+        local.cursorPosition = context.cursorPosition >= 0 && cursor >= 0 && cursor < shown ? cursor : -1;
         for (const Selection &selection : context.selections) {
+            // Clamped to the piece; a selection that goes on into the next piece covers the
+            // closing paragraph's separator, as in the document.
             const int start = selection.cursor.selectionStart() - piece.position;
             const int end = selection.cursor.selectionEnd() - piece.position;
-            if (end < 0 || start >= length)
+            if (end < 0 || start >= shown)
                 continue;
             QTextCursor mapped(piece.doc);
             mapped.setPosition(std::clamp(selection.cursor.anchor() - piece.position, 0, length - 1));
@@ -262,8 +284,9 @@ bool StackedTextLayout::appendToLastPiece(int from, int charsAdded)
 
 void StackedTextLayout::startOver()
 {
-    QList<Piece> old = std::exchange(m_pieces, {});
+    // Copying asks this layout about the document; the old pieces answer until the copy is made.
     QTextDocument *copy = document()->clone();
+    QList<Piece> old = std::exchange(m_pieces, {});
     const bool now = copy->characterCount() <= layoutAtOnceChars;
     adopt(copy, now ? copy->documentLayout()->documentSize() : QSizeF(0, 0));
     for (const Piece &piece : old)

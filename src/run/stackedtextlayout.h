@@ -19,9 +19,14 @@ class StackedTextLayout : public QAbstractTextDocumentLayout
     Q_OBJECT
 
 public:
+    // Ends a piece that another piece follows, before it is laid out: with a paragraph of no
+    // height after its text, so that a selection can go on over the end of its last paragraph.
+    static void closePiece(QTextDocument *piece);
+
     // Installs the layout on `doc` when the pieces hold its text, taking them over, and returns it;
-    // returns nullptr (and deletes the pieces) when they do not. The pieces must live in doc's
-    // thread now; they may have been laid out on other threads, which may have ended.
+    // returns nullptr (and deletes the pieces) when they do not. Every piece but the last must be
+    // closed. The pieces must live in doc's thread now; they may have been laid out on other
+    // threads, which may have ended.
     static StackedTextLayout *install(QTextDocument *doc, QList<QTextDocument *> pieces);
 
     void draw(QPainter *painter, const PaintContext &context) override;
@@ -53,6 +58,7 @@ private:
     bool appendToLastPiece(int from, int charsAdded);
     void scheduleFollowSettings();
     void followSettings();
+    int pieceEnd(int k) const;
     int pieceAtPosition(int position) const;
     int pieceAtBlock(int blockNumber) const;
     int pieceAtY(qreal y) const;

@@ -2,6 +2,7 @@
 #include "resultdisplay.h"
 #include "resultdisplaytext.h"
 #include "resultfiles.h"
+#include "stackedtextlayout.h"
 #include "testsupport.h"
 
 #include <QAbstractTextDocumentLayout>
@@ -66,6 +67,8 @@ private slots:
     void decoding_data();
     void decoding();
     void shownLengthOfPlainText();
+    void joiningLines_data();
+    void joiningLines();
     void looksLikeOneAppend_data();
     void looksLikeOneAppend();
     void hugeResultEndsWithSizeLine();
@@ -112,6 +115,52 @@ void TestResultDisplay::shownLengthOfPlainText()
     const qsizetype shown = ResultText::plainShownLength(tall, geometry);
     QVERIFY(shown < tall.size());
     QVERIFY(shown * geometry.lineHeight <= ResultText::maxLogHeight);
+}
+
+void TestResultDisplay::joiningLines_data()
+{
+    QTest::addColumn<QString>("text");
+    QTest::addColumn<int>("paragraphChars");
+    QTest::addColumn<QString>("joined");
+    const QChar ls = QChar::LineSeparator;
+    QTest::newRow("lf") << QStringLiteral("a\nb\nc\n") << 100 << QStringLiteral("a%1b%1c\n").arg(ls);
+    QTest::newRow("cr lf is one break") << QStringLiteral("a\r\nb\r\n") << 100 << QStringLiteral("a%1b\r\n").arg(ls);
+    QTest::newRow("lone cr, paragraph separator")
+        << QStringLiteral("a\rb\u2029c") << 100 << QStringLiteral("a%1b\u2029c").arg(ls);
+    QTest::newRow("empty lines") << QStringLiteral("a\n\n\n\nb") << 100 << QStringLiteral("a%1%1%1\nb").arg(ls);
+    QTest::newRow("last break stays") << QStringLiteral("a\n\n") << 100 << QStringLiteral("a%1\n").arg(ls);
+    QTest::newRow("no break") << QStringLiteral("abc") << 100 << QStringLiteral("abc");
+    QTest::newRow("paragraph length") << QStringLiteral("ab\ncd\nef\ngh\nij") << 4
+                                      << QStringLiteral("ab%1cd\nef%1gh\nij").arg(ls);
+    QTest::newRow("cr lf at paragraph end") << QStringLiteral("abcd\r\nef\r\ngh\r\nij") << 3
+                                            << QStringLiteral("abcd\r\nef%1gh\r\nij").arg(ls);
+    QTest::newRow("frame marks stay") << QStringLiteral("a\ufdd0b\nc\nd") << 100 << QStringLiteral("a\ufdd0b%1c\nd").arg(ls);
+    // Lines that could take another direction stay paragraphs of their own.
+    QTest::newRow("hebrew") << QStringLiteral("a\n\u05d0\nb") << 100 << QStringLiteral("a\n\u05d0\nb");
+    QTest::newRow("arabic digits") << QStringLiteral("a\n\u0661\nb") << 100 << QStringLiteral("a\n\u0661\nb");
+    QTest::newRow("embedding mark") << QStringLiteral("a\u202b\nb") << 100 << QStringLiteral("a\u202b\nb");
+    QTest::newRow("isolate mark") << QStringLiteral("a\u2067\nb") << 100 << QStringLiteral("a\u2067\nb");
+    QTest::newRow("right-to-left beyond the BMP")
+        << QStringLiteral("a\n\U00010800\nb") << 100 << QStringLiteral("a\n\U00010800\nb");
+    QTest::newRow("left-to-right beyond Latin")
+        << QStringLiteral("\u00c5\n\u4e2d\n\U0001d400\n\ufffd") << 100
+        << QStringLiteral("\u00c5%1\u4e2d%1\U0001d400\n\ufffd").arg(ls);
+}
+
+void TestResultDisplay::joiningLines()
+{
+    QFETCH(QString, text);
+    QFETCH(int, paragraphChars);
+    QFETCH(QString, joined);
+    QString result = text;
+    QCOMPARE(ResultText::joinLines(result, paragraphChars), joined != text);
+    QCOMPARE(result, joined);
+
+    // The log's plain text is the same either way.
+    QTextDocument one, other;
+    one.setPlainText(text);
+    other.setPlainText(result);
+    QCOMPARE(other.toPlainText(), one.toPlainText());
 }
 
 void TestResultDisplay::looksLikeOneAppend_data()
@@ -162,6 +211,12 @@ void TestResultDisplay::looksLikeOneAppend()
     QVERIFY2(stall < 2000, qPrintable(QString::number(stall)));
 
     QCOMPARE(log.toPlainText(), reference.toPlainText());
+    if (bytes.size() > resultShownNowBytes && !bytes.startsWith("<html>")) {
+        // A large plain result takes the fast way: two pieces laid out side by side.
+        auto *stacked = qobject_cast<StackedTextLayout *>(log.document()->documentLayout());
+        QVERIFY(stacked);
+        QCOMPARE(stacked->pieceCount(), 2);
+    }
     settle(log);
     settle(reference);
     QCOMPARE(log.verticalScrollBar()->maximum(), reference.verticalScrollBar()->maximum());
