@@ -208,16 +208,9 @@ void appendResult(QTextDocument *doc, const AppendFormats &formats, const Result
     appendPrepared(doc, formats, result, source, geometry);
 }
 
-// Where a plain result is cut into two pieces laid out side by side: at a paragraph break a
-// little before the middle (the first piece also holds the log's earlier text and the whole
-// document is built after it), or -1 for no cut.
-qsizetype pieceBreak(const QString &text)
-{
-    const qsizetype at = text.indexOf(QLatin1Char('\n'), text.size() * 9 / 20);
-    if (at > 0 && text.at(at - 1) == QLatin1Char('\r'))
-        return at - 1;
-    return at;
-}
+// A plain result is shown in pieces of about this many characters: laid out when first shown,
+// each takes a few dozen milliseconds.
+constexpr qsizetype pieceChars = 128 * 1024;
 
 // The same font, but not shared with other copies: a font caches its glyph engine for one thread
 // at a time, and two threads laying out text in fonts that share it would keep replacing it.
@@ -334,7 +327,7 @@ public:
 
 private:
     void buildCopy();
-    void buildSecondPiece();
+    void buildLaterPieces();
     void workerFinished();
     void built();
     void layoutSlice();
@@ -344,14 +337,14 @@ private:
     QPointer<QTextDocument> m_logDocument; // the document the copy replaces
     QTextDocument *m_copy = nullptr;       // owned until handed to the log
     QTextDocument *m_firstPiece = nullptr; // a plain result's pieces, owned until handed over
-    QTextDocument *m_secondPiece = nullptr;
+    QTextDocument *m_pieceModel = nullptr; // how the later ones lay text out
+    QList<QTextDocument *> m_laterPieces;
     QPointer<QTextDocument> m_shown;       // the copy once it is the log's document
     QThread *m_worker = nullptr;
     QThread *m_secondWorker = nullptr;
     QSemaphore m_prepared;                 // the second worker's text is ready
-    bool m_hasSecondPiece = false;
-    QString m_secondText;                  // what the second piece shows
-    QString m_secondEndLine;               // and the line after it
+    QStringList m_laterTexts;              // what the later pieces show
+    QString m_endLine;                     // and the line after the last one
     QTimer m_layoutTimer;
     QMetaObject::Connection m_watch;
     ResultSource m_source;
@@ -393,17 +386,17 @@ ResultDisplayJob::ResultDisplayJob(QTextEdit *log, ResultSource source)
     m_firstPiece = doc->clone();
     m_firstPiece->setUndoRedoEnabled(false);
     m_firstPiece->setDefaultFont(unsharedFont(doc->defaultFont()));
-    m_secondPiece = emptyLike(doc);
+    m_pieceModel = emptyLike(doc);
 
     // Anyone else changing the log meanwhile makes the copy stale: the display then gives way.
     m_watch = connect(doc, &QTextDocument::contentsChange, this, [this] { cancel(); });
 
     m_worker = QThread::create([this] { buildCopy(); });
-    m_secondWorker = QThread::create([this] { buildSecondPiece(); });
+    m_secondWorker = QThread::create([this] { buildLaterPieces(); });
     // Documents get frames and lists from the thread that builds them: they must belong to it.
     m_copy->moveToThread(m_worker);
     m_firstPiece->moveToThread(m_worker);
-    m_secondPiece->moveToThread(m_secondWorker);
+    m_pieceModel->moveToThread(m_secondWorker);
     for (QThread *worker : {m_worker, m_secondWorker}) {
         connect(worker, &QThread::finished, this, [this] { workerFinished(); });
         worker->start();
@@ -423,7 +416,8 @@ ResultDisplayJob::~ResultDisplayJob()
     }
     delete m_copy;
     delete m_firstPiece;
-    delete m_secondPiece;
+    delete m_pieceModel;
+    qDeleteAll(m_laterPieces);
 }
 
 // First worker: the text, then for a plain result the first piece, laid out; then the copy.
@@ -432,26 +426,28 @@ void ResultDisplayJob::buildCopy()
     QThread *gui = thread();
     m_result = prepareResult(m_source, m_formats, m_geometry);
     const bool plain = !m_result.rich;
-    // Pieces meet at a paragraph break; paragraphs with margins would not meet as in one layout.
-    const qsizetype cut = plain && linesMayShareParagraphs(m_formats.block) ? pieceBreak(m_result.text) : -1;
+    // Pieces meet at paragraph breaks; paragraphs with margins would not meet as in one layout.
+    const QList<qsizetype> breaks = plain && linesMayShareParagraphs(m_formats.block)
+                                        ? pieceBreaks(m_result.text, pieceChars)
+                                        : QList<qsizetype>();
     const QString endLine = m_result.whole ? QString() : tooLargeLineFor(m_source);
-    if (cut >= 0) {
-        const qsizetype breakLength = m_result.text.at(cut) == QLatin1Char('\r') ? 2 : 1;
-        m_secondText = m_result.text.mid(cut + breakLength);
-        m_secondEndLine = endLine;
-        m_hasSecondPiece = true;
+    for (qsizetype k = 0; k < breaks.size(); ++k) {
+        const qsizetype start = breaks.at(k) + (m_result.text.at(breaks.at(k)) == QLatin1Char('\r') ? 2 : 1);
+        const qsizetype end = k + 1 < breaks.size() ? breaks.at(k + 1) : m_result.text.size();
+        m_laterTexts.append(m_result.text.mid(start, end - start));
     }
+    m_endLine = endLine;
     m_prepared.release();
 
     if (plain) {
         QTextCursor cursor(m_firstPiece);
         cursor.beginEditBlock();
         beginAppend(cursor, m_formats);
-        cursor.insertText(cut < 0 ? m_result.text : m_result.text.left(cut));
+        cursor.insertText(breaks.isEmpty() ? m_result.text : m_result.text.left(breaks.first()));
         cursor.endEditBlock();
-        if (cut < 0 && !endLine.isEmpty())
+        if (breaks.isEmpty() && !endLine.isEmpty())
             appendHtml(m_firstPiece, m_formats, endLine);
-        if (cut >= 0)
+        if (!breaks.isEmpty())
             StackedTextLayout::closePiece(m_firstPiece);
         layOut(m_firstPiece, m_pageWidth);
         m_firstPiece->moveToThread(gui);
@@ -466,29 +462,35 @@ void ResultDisplayJob::buildCopy()
     m_copy->moveToThread(gui);
 }
 
-// Second worker: the rest of a plain result after the break, laid out. Uses only what the first
-// worker set before it let this one go, and what nobody changes.
-void ResultDisplayJob::buildSecondPiece()
+// Second worker: the later pieces of a plain result, each laid out or ready to be laid out when
+// shown. Uses only what the first worker set before it let this one go, and what nobody changes.
+void ResultDisplayJob::buildLaterPieces()
 {
     m_prepared.acquire();
-    if (!m_hasSecondPiece) {
-        delete m_secondPiece;
-        m_secondPiece = nullptr;
-        return;
+    for (qsizetype k = 0; k < m_laterTexts.size(); ++k) {
+        const bool last = k + 1 == m_laterTexts.size();
+        QTextDocument *piece = emptyLike(m_pieceModel);
+        QTextCursor cursor(piece);
+        cursor.beginEditBlock();
+        // The paragraph a break opens, as typing the break in the copy makes it.
+        cursor.setBlockFormat(m_formats.block);
+        cursor.setBlockCharFormat(m_formats.chars);
+        cursor.setCharFormat(m_formats.chars);
+        cursor.insertText(m_laterTexts.at(k));
+        cursor.endEditBlock();
+        if (!last)
+            StackedTextLayout::closePiece(piece);
+        else if (!m_endLine.isEmpty())
+            appendHtml(piece, m_formats, m_endLine);
+        piece->setPageSize(QSizeF(m_pageWidth, -1));
+        if (!StackedTextLayout::prepareWithoutLayout(piece))
+            layOut(piece, m_pageWidth);
+        piece->moveToThread(thread());
+        m_laterPieces.append(piece);
     }
-    QTextCursor cursor(m_secondPiece);
-    cursor.beginEditBlock();
-    // The paragraph the break opens, as typing the break in the copy makes it.
-    cursor.setBlockFormat(m_formats.block);
-    cursor.setBlockCharFormat(m_formats.chars);
-    cursor.setCharFormat(m_formats.chars);
-    cursor.insertText(m_secondText);
-    cursor.endEditBlock();
-    m_secondText = QString();
-    if (!m_secondEndLine.isEmpty())
-        appendHtml(m_secondPiece, m_formats, m_secondEndLine);
-    layOut(m_secondPiece, m_pageWidth);
-    m_secondPiece->moveToThread(thread());
+    m_laterTexts.clear();
+    delete m_pieceModel;
+    m_pieceModel = nullptr;
 }
 
 void ResultDisplayJob::workerFinished()
@@ -524,18 +526,23 @@ void ResultDisplayJob::built()
     disconnect(m_watch);
 
     QTextDocument *copy = std::exchange(m_copy, nullptr);
+    bool laidOut = false;
     if (m_firstPiece) {
         QList<QTextDocument *> pieces{std::exchange(m_firstPiece, nullptr)};
-        if (m_secondPiece)
-            pieces.append(std::exchange(m_secondPiece, nullptr));
+        pieces.append(std::exchange(m_laterPieces, {}));
         // Pieces that do not add up to the copy are dropped: it is then laid out as usual.
-        StackedTextLayout::install(copy, pieces);
+        laidOut = StackedTextLayout::install(copy, pieces) != nullptr;
     }
     copy->setUndoRedoEnabled(m_logDocument->isUndoRedoEnabled());
     // Owned as the document it replaces was: the editor deletes that one if it owned it.
     copy->setParent(m_logDocument->parent());
     m_shown = copy;
     m_log->setDocument(copy);
+    if (laidOut) {
+        // What is shown is laid out already or as it comes into view.
+        finish();
+        return;
+    }
 
     m_log->verticalScrollBar()->setValue(m_scrollValue);
 

@@ -24,6 +24,6 @@ void cancelResultDisplay(QTextEdit *log);
 bool resultDisplayBusy(QTextEdit *log);
 
 // Results up to this size are shown before showResultFile returns.
-constexpr qint64 resultShownNowBytes = 1024 * 1024;
+constexpr qint64 resultShownNowBytes = 256 * 1024;
 
 #endif

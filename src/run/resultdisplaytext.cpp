@@ -3,6 +3,7 @@
 
 #include <QStringDecoder>
 
+#include <algorithm>
 #include <cmath>
 
 namespace ResultText {
@@ -144,6 +145,20 @@ bool joinLines(QString &text, qsizetype paragraphChars)
     }
     text.truncate(out);
     return joined;
+}
+
+QList<qsizetype> pieceBreaks(const QString &text, qsizetype pieceChars)
+{
+    QList<qsizetype> breaks;
+    qsizetype from = std::max<qsizetype>(pieceChars, 1);
+    while (from < text.size()) {
+        const qsizetype lineFeed = text.indexOf(QLatin1Char('\n'), from);
+        if (lineFeed < 0)
+            break;
+        breaks.append(lineFeed > 0 && text.at(lineFeed - 1) == QLatin1Char('\r') ? lineFeed - 1 : lineFeed);
+        from = lineFeed + 1 + pieceChars;
+    }
+    return breaks;
 }
 
 QString tooLargeLine(const QString &path, qint64 fileSize)

@@ -2,6 +2,7 @@
 #define MORVEL_RESULTDISPLAYTEXT_H
 
 #include <QByteArray>
+#include <QList>
 #include <QString>
 
 // The plain-text side of showing a result file: decoding, and how much of it the log can take.
@@ -47,6 +48,10 @@ qsizetype plainShownLength(const QString &text, const LogGeometry &geometry,
 // there a paragraph's direction would carry over from one line to the next. The last line break
 // stays a paragraph break. Returns whether anything was joined.
 bool joinLines(QString &text, qsizetype paragraphChars = 4096);
+
+// Where a plain text is cut into pieces of about `pieceChars` characters each: the positions of
+// line feeds (of the CR of a CR LF) that end a piece, in order. Each later piece starts after one.
+QList<qsizetype> pieceBreaks(const QString &text, qsizetype pieceChars);
 
 // The log entry (error style) that follows a result shown only in part.
 QString tooLargeLine(const QString &path, qint64 fileSize);

@@ -1,5 +1,6 @@
 #include "stackedtextlayout.h"
 
+#include <QFontMetricsF>
 #include <QPainter>
 #include <QTextBlock>
 #include <QTextCursor>
@@ -41,6 +42,34 @@ void forgetGlyphEngines(QTextDocument *piece)
         block.layout()->setFont(font);
 }
 
+const char *const sizeProperty = "stackedTextLayoutSize";
+
+// A piece's paragraphs all look alike: nothing in their format that the size cannot foresee.
+bool plainParagraphFormat(const QTextBlockFormat &format)
+{
+    return format.topMargin() == 0 && format.bottomMargin() == 0 && format.leftMargin() == 0
+           && format.rightMargin() == 0 && format.textIndent() == 0 && format.indent() == 0
+           && format.alignment() != Qt::AlignJustify && format.tabPositions().isEmpty()
+           && !format.hasProperty(QTextFormat::LineHeight)
+           && !format.hasProperty(QTextFormat::ObjectIndex)
+           && format.marker() == QTextBlockFormat::MarkerType::NoMarker;
+}
+
+bool plainCharFormat(const QTextCharFormat &format)
+{
+    const QFont font = format.font();
+    return format.verticalAlignment() == QTextCharFormat::AlignNormal && !format.isAnchor()
+           && font.letterSpacing() == 0 && font.wordSpacing() == 0
+           && font.capitalization() == QFont::MixedCase;
+}
+
+bool isClosingParagraph(const QTextBlock &block)
+{
+    const QTextBlockFormat format = block.blockFormat();
+    return !block.next().isValid() && block.length() == 1
+           && format.lineHeightType() == QTextBlockFormat::FixedHeight && format.lineHeight() == 0;
+}
+
 // Small documents are laid out at once when the layout starts over; larger ones lazily, as the
 // editor does it.
 constexpr int layoutAtOnceChars = 256 * 1024;
@@ -48,6 +77,89 @@ constexpr int layoutAtOnceChars = 256 * 1024;
 } // namespace
 
 StackedTextLayout::StackedTextLayout(QTextDocument *doc) : QAbstractTextDocumentLayout(doc) {}
+
+bool StackedTextLayout::prepareWithoutLayout(QTextDocument *piece)
+{
+    const std::optional<QSizeF> size = sizeWithoutLayout(piece);
+    if (size)
+        piece->setProperty(sizeProperty, *size);
+    return size.has_value();
+}
+
+std::optional<QSizeF> StackedTextLayout::sizeWithoutLayout(const QTextDocument *piece)
+{
+    const qreal pageWidth = piece->pageSize().width();
+    const QTextBlock first = piece->begin();
+    if (pageWidth <= 0 || !first.isValid())
+        return std::nullopt;
+    const QTextBlockFormat blockFormat = first.blockFormat();
+    const QTextCharFormat charFormat = first.charFormat();
+    if (!plainParagraphFormat(blockFormat) || !plainCharFormat(charFormat))
+        return std::nullopt;
+
+    // A line fits when the sum of its letters' advances, with room to spare for kerning, does.
+    const QFont font = charFormat.font();
+    const QFontMetricsF metrics(font);
+    const QTextFrameFormat frame = piece->rootFrame()->frameFormat();
+    const qreal room = pageWidth - frame.leftMargin() - frame.rightMargin() - 2 * (frame.border() + frame.padding());
+    const qreal limit = room * 0.9 - 2 * metrics.maxWidth();
+    const qreal tab = piece->defaultTextOption().tabStopDistance();
+    qreal advance[256];
+    for (int c = 0; c < 256; ++c) {
+        const QChar ch(c);
+        const bool letter = (c >= 0x20 && c < 0x7f) || (c >= 0xa0 && c != 0xad);
+        advance[c] = letter && metrics.inFont(ch) ? metrics.horizontalAdvance(ch) : -1;
+    }
+    advance[int('\t')] = tab;
+
+    qsizetype lines = 0;
+    for (QTextBlock block = first; block.isValid(); block = block.next()) {
+        if (isClosingParagraph(block) && block != first)
+            break;
+        if (block.blockFormat() != blockFormat || block.charFormat() != charFormat)
+            return std::nullopt;
+        for (auto it = block.begin(); !it.atEnd(); ++it) {
+            if (it.fragment().charFormat() != charFormat)
+                return std::nullopt;
+        }
+        const QString text = block.text();
+        if (text.endsWith(QChar::LineSeparator))
+            return std::nullopt;
+        qreal width = 0;
+        for (const QChar ch : text) {
+            const char16_t c = ch.unicode();
+            if (c == QChar::LineSeparator) {
+                ++lines;
+                width = 0;
+                continue;
+            }
+            if (c > 0xff || advance[c] < 0)
+                return std::nullopt;
+            width += advance[c];
+            if (width > limit)
+                return std::nullopt;
+        }
+        ++lines;
+    }
+
+    // The height of one line and of the rest, from a sample laid out as the piece would be.
+    QTextDocument sample;
+    sample.setDefaultFont(piece->defaultFont());
+    sample.setDefaultTextOption(piece->defaultTextOption());
+    sample.setDocumentMargin(piece->documentMargin());
+    sample.rootFrame()->setFrameFormat(frame);
+    sample.setPageSize(piece->pageSize());
+    QTextCursor cursor(&sample);
+    cursor.setBlockFormat(blockFormat);
+    cursor.setBlockCharFormat(charFormat);
+    cursor.setCharFormat(charFormat);
+    cursor.insertText(QStringLiteral("x"));
+    const QSizeF one = sample.documentLayout()->documentSize();
+    cursor.insertText(QString(QChar::LineSeparator) + QStringLiteral("x"));
+    const QSizeF two = sample.documentLayout()->documentSize();
+    const qreal lineHeight = two.height() - one.height();
+    return QSizeF(one.width(), one.height() + lineHeight * qreal(lines - 1));
+}
 
 void StackedTextLayout::closePiece(QTextDocument *piece)
 {
@@ -75,8 +187,14 @@ StackedTextLayout *StackedTextLayout::install(QTextDocument *doc, QList<QTextDoc
     }
     auto *layout = new StackedTextLayout(doc);
     for (QTextDocument *piece : std::as_const(pieces)) {
-        forgetGlyphEngines(piece);
-        layout->adopt(piece, piece->documentLayout()->documentSize());
+        const QVariant known = piece->property(sizeProperty);
+        piece->setProperty(sizeProperty, QVariant());
+        if (known.isValid()) {
+            layout->adopt(piece, known.toSizeF(), false);
+        } else {
+            forgetGlyphEngines(piece);
+            layout->adopt(piece, piece->documentLayout()->documentSize(), true);
+        }
     }
     layout->restack();
     doc->setDocumentLayout(layout);
@@ -85,11 +203,12 @@ StackedTextLayout *StackedTextLayout::install(QTextDocument *doc, QList<QTextDoc
     return layout;
 }
 
-void StackedTextLayout::adopt(QTextDocument *piece, const QSizeF &size)
+void StackedTextLayout::adopt(QTextDocument *piece, const QSizeF &size, bool laidOut)
 {
     Piece entry;
     entry.doc = piece;
     entry.size = size;
+    entry.laidOut = laidOut;
     if (!m_pieces.isEmpty()) {
         const Piece &before = m_pieces.last();
         entry.position = before.position + before.doc->characterCount() - 1;
@@ -97,7 +216,13 @@ void StackedTextLayout::adopt(QTextDocument *piece, const QSizeF &size)
     }
     piece->setParent(this);
     m_pieces.append(entry);
+    if (laidOut)
+        follow(piece);
+}
 
+// Passes on what a piece's own layout says: its size as it lays out, and what to draw again.
+void StackedTextLayout::follow(QTextDocument *piece)
+{
     QAbstractTextDocumentLayout *layout = piece->documentLayout();
     connect(layout, &QAbstractTextDocumentLayout::documentSizeChanged, this, [this, piece](const QSizeF &newSize) {
         for (Piece &p : m_pieces) {
@@ -120,6 +245,38 @@ void StackedTextLayout::adopt(QTextDocument *piece, const QSizeF &size)
                 emit updateBlock(document()->findBlockByNumber(p.block + block.blockNumber()));
         }
     });
+}
+
+// Piece k, laid out now if it was waiting to be shown. Its size was known exactly; should it
+// differ all the same, the pieces after it move and the editor hears of it.
+const StackedTextLayout::Piece &StackedTextLayout::laidOutPiece(int k) const
+{
+    Piece &piece = m_pieces[k];
+    if (!piece.laidOut) {
+        piece.laidOut = true;
+        auto *self = const_cast<StackedTextLayout *>(this);
+        self->follow(piece.doc);
+        const QSizeF size = piece.doc->documentLayout()->documentSize();
+        if (size != piece.size) {
+            piece.size = size;
+            self->restack();
+            if (!m_sizeNewsPending) {
+                // Not from inside a paint or a question about a position: from the event loop.
+                m_sizeNewsPending = true;
+                QMetaObject::invokeMethod(self, [self] {
+                    self->m_sizeNewsPending = false;
+                    emit self->documentSizeChanged(self->documentSize());
+                    emit self->update();
+                }, Qt::QueuedConnection);
+            }
+        }
+    }
+    return piece;
+}
+
+int StackedTextLayout::piecesLaidOut() const
+{
+    return int(std::count_if(m_pieces.cbegin(), m_pieces.cend(), [](const Piece &p) { return p.laidOut; }));
 }
 
 void StackedTextLayout::restack()
@@ -166,10 +323,10 @@ void StackedTextLayout::draw(QPainter *painter, const PaintContext &context)
 {
     const QVariant cursorWidth = property("cursorWidth");
     for (int k = 0; k < m_pieces.size(); ++k) {
-        const Piece &piece = m_pieces.at(k);
-        const QRectF area(0, piece.top, std::max(piece.size.width(), 1e9), piece.size.height());
+        const QRectF area(0, m_pieces.at(k).top, 1e9, m_pieces.at(k).size.height());
         if (context.clip.isValid() && !context.clip.intersects(area))
             continue;
+        const Piece &piece = laidOutPiece(k);
         const int length = piece.doc->characterCount();
         const int shown = pieceEnd(k) - piece.position;
         PaintContext local;
@@ -202,7 +359,7 @@ void StackedTextLayout::draw(QPainter *painter, const PaintContext &context)
 
 int StackedTextLayout::hitTest(const QPointF &point, Qt::HitTestAccuracy accuracy) const
 {
-    const Piece &piece = m_pieces.at(pieceAtY(point.y()));
+    const Piece &piece = laidOutPiece(pieceAtY(point.y()));
     const int position = piece.doc->documentLayout()->hitTest(point - QPointF(0, piece.top), accuracy);
     return position < 0 ? -1 : piece.position + position;
 }
@@ -225,7 +382,7 @@ QRectF StackedTextLayout::frameBoundingRect(QTextFrame *frame) const
 {
     if (!frame || frame == document()->rootFrame())
         return QRectF(QPointF(0, 0), documentSize());
-    const Piece &piece = m_pieces.at(pieceAtPosition(frame->firstPosition()));
+    const Piece &piece = laidOutPiece(pieceAtPosition(frame->firstPosition()));
     const int first = frame->firstPosition() - piece.position;
     QTextFrame *inPiece = piece.doc->frameAt(first);
     while (inPiece && inPiece->firstPosition() != first)
@@ -239,7 +396,7 @@ QRectF StackedTextLayout::blockBoundingRect(const QTextBlock &block) const
 {
     if (!block.isValid())
         return QRectF();
-    const Piece &piece = m_pieces.at(pieceAtBlock(block.blockNumber()));
+    const Piece &piece = laidOutPiece(pieceAtBlock(block.blockNumber()));
     const QTextBlock inPiece = piece.doc->findBlockByNumber(block.blockNumber() - piece.block);
     if (!inPiece.isValid())
         return QRectF();
@@ -264,6 +421,7 @@ void StackedTextLayout::documentChanged(int from, int charsRemoved, int charsAdd
 
 bool StackedTextLayout::appendToLastPiece(int from, int charsAdded)
 {
+    laidOutPiece(int(m_pieces.size()) - 1);
     Piece &last = m_pieces.last();
     QTextDocument *doc = document();
     if (from < last.position || from - last.position >= last.doc->characterCount())
@@ -288,7 +446,7 @@ void StackedTextLayout::startOver()
     QTextDocument *copy = document()->clone();
     QList<Piece> old = std::exchange(m_pieces, {});
     const bool now = copy->characterCount() <= layoutAtOnceChars;
-    adopt(copy, now ? copy->documentLayout()->documentSize() : QSizeF(0, 0));
+    adopt(copy, now ? copy->documentLayout()->documentSize() : QSizeF(0, 0), true);
     for (const Piece &piece : old)
         delete piece.doc;
 }
@@ -318,6 +476,15 @@ void StackedTextLayout::followSettings()
             p->setIndentWidth(doc->indentWidth());
         if (p->pageSize() != doc->pageSize())
             p->setPageSize(doc->pageSize());
+    }
+    // A piece still waiting to be shown knows its new size without a layout, or gets laid out.
+    for (int k = 0; k < m_pieces.size(); ++k) {
+        if (m_pieces.at(k).laidOut)
+            continue;
+        if (const std::optional<QSizeF> size = sizeWithoutLayout(m_pieces.at(k).doc))
+            m_pieces[k].size = *size;
+        else
+            laidOutPiece(k);
     }
     restack();
     emit documentSizeChanged(documentSize());

@@ -5,6 +5,8 @@
 #include <QList>
 #include <QSizeF>
 
+#include <optional>
+
 // Lays a document out as a stack of pieces: copies of consecutive parts of its text, each laid out
 // by Qt's own document layout in a document of its own. Pieces can be laid out on several threads
 // at once before they are stacked, which is what makes a very long log quick to show; what the
@@ -23,10 +25,19 @@ public:
     // height after its text, so that a selection can go on over the end of its last paragraph.
     static void closePiece(QTextDocument *piece);
 
+    // Lets a piece wait with its layout until it is shown, when its height can be known without
+    // it: one format throughout, only letters of its font, no line wider than the page. Returns
+    // false, changing nothing, when that is not so: the piece must then be laid out.
+    static bool prepareWithoutLayout(QTextDocument *piece);
+
+    // The exact size Qt's layout gives `piece` at its page size, or nothing when it cannot be
+    // known without laying it out (see prepareWithoutLayout).
+    static std::optional<QSizeF> sizeWithoutLayout(const QTextDocument *piece);
+
     // Installs the layout on `doc` when the pieces hold its text, taking them over, and returns it;
     // returns nullptr (and deletes the pieces) when they do not. Every piece but the last must be
-    // closed. The pieces must live in doc's thread now; they may have been laid out on other
-    // threads, which may have ended.
+    // closed, and laid out or prepared to be laid out when shown. The pieces must live in doc's
+    // thread now; they may have been laid out on other threads, which may have ended.
     static StackedTextLayout *install(QTextDocument *doc, QList<QTextDocument *> pieces);
 
     void draw(QPainter *painter, const PaintContext &context) override;
@@ -37,6 +48,7 @@ public:
     QRectF blockBoundingRect(const QTextBlock &block) const override;
 
     int pieceCount() const { return int(m_pieces.size()); }
+    int piecesLaidOut() const;
 
 protected:
     void documentChanged(int from, int charsRemoved, int charsAdded) override;
@@ -47,12 +59,15 @@ private:
         QTextDocument *doc = nullptr;
         int position = 0; // of its first character in the document
         int block = 0;    // number of its first block in the document
-        QSizeF size;      // as its layout last reported it
+        QSizeF size;      // as its layout last reported it, or as known without it
         qreal top = 0;    // where its own origin lies in the document
+        bool laidOut = false;
     };
 
     explicit StackedTextLayout(QTextDocument *doc);
-    void adopt(QTextDocument *piece, const QSizeF &size);
+    void adopt(QTextDocument *piece, const QSizeF &size, bool laidOut);
+    void follow(QTextDocument *piece);
+    const Piece &laidOutPiece(int k) const;
     void restack();
     void startOver();
     bool appendToLastPiece(int from, int charsAdded);
@@ -63,7 +78,8 @@ private:
     int pieceAtBlock(int blockNumber) const;
     int pieceAtY(qreal y) const;
 
-    QList<Piece> m_pieces;
+    mutable QList<Piece> m_pieces; // laid out when first shown
+    mutable bool m_sizeNewsPending = false;
     bool m_editPending = false;   // the document announced a change of its text
     bool m_followPending = false; // a change of page size or font is still to be passed on
 };

@@ -212,10 +212,12 @@ void TestResultDisplay::looksLikeOneAppend()
 
     QCOMPARE(log.toPlainText(), reference.toPlainText());
     if (bytes.size() > resultShownNowBytes && !bytes.startsWith("<html>")) {
-        // A large plain result takes the fast way: two pieces laid out side by side.
+        // A large plain result takes the fast way: in pieces, most of them laid out only when
+        // they come into view (their height is known without it, and compared below).
         auto *stacked = qobject_cast<StackedTextLayout *>(log.document()->documentLayout());
         QVERIFY(stacked);
-        QCOMPARE(stacked->pieceCount(), 2);
+        QVERIFY(stacked->pieceCount() > 50);
+        QVERIFY(stacked->piecesLaidOut() < 5);
     }
     settle(log);
     settle(reference);

@@ -21,9 +21,9 @@ void fillLog(QTextEdit &log)
     QString result;
     for (int i = 0; i < 3000; ++i) {
         result += QStringLiteral("  Fe1   - O2      2.0135(3)  x2   %1").arg(i);
-        if (i % 97 == 5)
+        if (i >= 1000 && i < 1200 && i % 20 == 5)
             result += QStringLiteral(" and a long remark that has to wrap in the log because it goes on and on");
-        result += i % 16 == 15 ? QChar(u'\n') : QChar(QChar::LineSeparator);
+        result += i % 16 == 15 || i == 2999 ? QChar(u'\n') : QChar(QChar::LineSeparator);
     }
     log.append(result);
 }
@@ -98,6 +98,7 @@ private slots:
     void cleanup();
     void looksAsOneLayout();
     void followsAppendsAndWidth();
+    void waitingPiecesFollowWidth();
     void startsOverWhenCleared();
     void refusesPiecesThatDoNotAddUp();
 
@@ -108,6 +109,7 @@ private:
     QTextEdit *m_stacked = nullptr;
     StackedTextLayout *m_layout = nullptr;
     int m_seamBlock = 0;
+    int m_prepared = 0; // pieces that waited for their layout
 };
 
 void TestStackedLayout::init()
@@ -119,15 +121,23 @@ void TestStackedLayout::init()
     m_stacked = new QTextEdit;
     prepare(*m_stacked);
     QTextDocument *doc = m_reference->document()->clone();
-    m_seamBlock = doc->blockCount() / 2;
+    // Five pieces: the log's entries with the first result lines, lines with wrapping remarks,
+    // and plain lines that need no layout before they are shown.
+    const int blocks = doc->blockCount();
+    const QList<int> starts{0, blocks / 5, 2 * blocks / 5, 3 * blocks / 5, 4 * blocks / 5, blocks};
+    m_seamBlock = starts.at(1);
     const qreal width = m_reference->viewport()->width();
-    const QList<QTextDocument *> pieces{pieceOf(doc, 0, m_seamBlock, width),
-                                        pieceOf(doc, m_seamBlock, doc->blockCount(), width)};
+    QList<QTextDocument *> pieces;
+    for (int k = 0; k + 1 < starts.size(); ++k) {
+        pieces.append(pieceOf(doc, starts.at(k), starts.at(k + 1), width));
+        m_prepared += StackedTextLayout::prepareWithoutLayout(pieces.last()) ? 1 : 0;
+    }
     m_layout = StackedTextLayout::install(doc, pieces);
     QVERIFY(m_layout);
     doc->setParent(m_stacked);
     m_stacked->setDocument(doc);
-    settle(*m_reference, *m_stacked);
+    m_reference->document()->documentLayout()->documentSize();
+    QTest::qWait(50);
 }
 
 void TestStackedLayout::cleanup()
@@ -163,7 +173,16 @@ void TestStackedLayout::compare(int line)
 
 void TestStackedLayout::looksAsOneLayout()
 {
-    QCOMPARE(m_layout->pieceCount(), 2);
+    QCOMPARE(m_layout->pieceCount(), 5);
+    // The first piece holds the styled entries, the next two lines that wrap: they are laid out.
+    QCOMPARE(m_prepared, 2);
+    QVERIFY(m_layout->piecesLaidOut() < m_layout->pieceCount());
+    // Sizes known without a layout are exact: the scroll range is right before anything is laid out.
+    QCOMPARE(m_stacked->document()->documentLayout()->documentSize(),
+             m_reference->document()->documentLayout()->documentSize());
+    QCOMPARE(m_stacked->verticalScrollBar()->maximum(), m_reference->verticalScrollBar()->maximum());
+    settle(*m_reference, *m_stacked);
+    QCOMPARE(m_layout->piecesLaidOut(), m_layout->pieceCount());
     compare(__LINE__);
 
     // A selection across the seam is drawn as one.
@@ -185,6 +204,7 @@ void TestStackedLayout::looksAsOneLayout()
 
 void TestStackedLayout::followsAppendsAndWidth()
 {
+    settle(*m_reference, *m_stacked);
     // Entries after the result go into the last piece, which lays them out at once.
     for (QTextEdit *log : {m_reference, m_stacked}) {
         log->verticalScrollBar()->setValue(log->verticalScrollBar()->maximum());
@@ -192,7 +212,7 @@ void TestStackedLayout::followsAppendsAndWidth()
         log->append(LogStyle::error(QStringLiteral(" There is no MORVEL.OUT file in the current directory! ")));
         log->append(QStringLiteral("plain words & more"));
     }
-    QCOMPARE(m_layout->pieceCount(), 2);
+    QCOMPARE(m_layout->pieceCount(), 5);
     QCOMPARE(m_stacked->verticalScrollBar()->value(), m_stacked->verticalScrollBar()->maximum());
     settle(*m_reference, *m_stacked);
     compare(__LINE__);
@@ -200,6 +220,24 @@ void TestStackedLayout::followsAppendsAndWidth()
     // A narrower log: every piece is laid out again at the new width.
     m_reference->resize(420, 300);
     m_stacked->resize(420, 300);
+    settle(*m_reference, *m_stacked);
+    compare(__LINE__);
+}
+
+void TestStackedLayout::waitingPiecesFollowWidth()
+{
+    // Pieces not yet shown know their size at another width without a layout too, as long as
+    // their lines still fit; a width too narrow for them gets them laid out.
+    for (int width : {500, 300}) {
+        m_reference->resize(width, 300);
+        m_stacked->resize(width, 300);
+        QTest::qWait(50);
+        m_reference->document()->documentLayout()->documentSize();
+        QTest::qWait(50);
+        QCOMPARE(m_stacked->document()->documentLayout()->documentSize(),
+                 m_reference->document()->documentLayout()->documentSize());
+    }
+    QCOMPARE(m_layout->piecesLaidOut(), m_layout->pieceCount());
     settle(*m_reference, *m_stacked);
     compare(__LINE__);
 }
