@@ -247,10 +247,14 @@ qreal shownPageWidth(QTextEdit *log)
     return std::max(width, 1);
 }
 
+// Lays a document out on a worker thread. The layout ends by starting a timer to report its size;
+// letting it fire here leaves no timer to move with the document to the GUI thread (Qt loses the
+// bookkeeping of a moved timer when the document is deleted before the GUI thread takes it over).
 void layOut(QTextDocument *doc, qreal pageWidth)
 {
     doc->setPageSize(QSizeF(pageWidth, -1));
     doc->documentLayout()->documentSize();
+    QCoreApplication::processEvents();
 }
 
 // Lets the scroll bars follow a layout finished outside the event loop (the layout itself would
