@@ -1,6 +1,8 @@
 // Result display benchmark: for results of several sizes, the time from the end of the
 // computation program (Import::endMorvel) until the result is shown in the log, and the longest
-// stretch in which the event loop did not run meanwhile, as a 10 ms timer sees it.
+// stretch in which the event loop did not run meanwhile, as a 10 ms timer sees it. Then, with the
+// result shown: the longest of 20 jumps of the view to places spread over the log (each drawn at
+// once), and the longest stall while the log follows a narrower dialog.
 // Run:  QT_QPA_PLATFORM=offscreen build/bench/resultdisplay/bench_resultdisplay [--rich] [MB...]
 //       (defaults: plain text; 1 10 50 200 MB)
 #include "import.h"
@@ -31,8 +33,8 @@ int main(int argc, char **argv)
     if (sizes.isEmpty())
         sizes = {1, 10, 50, 200};
 
-    std::printf("%-8s %-6s %12s %14s %12s  %s\n", "size MB", "kind", "shown (ms)", "longest stall",
-                "log lines", "end of the log");
+    std::printf("%-8s %-6s %12s %14s %10s %13s %12s  %s\n", "size MB", "kind", "shown (ms)",
+                "longest stall", "jump (ms)", "resize stall", "log lines", "end of the log");
     for (double mb : sizes) {
         QTemporaryDir dir;
         const QString path = dir.path() + QStringLiteral("/MORVEL.OUT");
@@ -63,12 +65,49 @@ int main(int argc, char **argv)
         longest = std::max(longest, sinceTick.elapsed());
         tick.stop();
 
+        // Jumps through the log, each painted before the next.
+        QScrollBar *bar = dialog.importlog->verticalScrollBar();
+        qint64 jump = 0;
+        for (int step = 0; step < 20; ++step) {
+            QElapsedTimer one;
+            one.start();
+            bar->setValue(int(qint64(bar->maximum()) * step / 19));
+            dialog.importlog->viewport()->repaint();
+            jump = std::max(jump, one.elapsed());
+        }
+
+        // A narrower log: it lays its text out again at the new width.
+        QCoreApplication::processEvents();
+        qint64 resizeStall = 0;
+        QTimer resizeTick;
+        QObject::connect(&resizeTick, &QTimer::timeout, [&] { resizeStall = std::max(resizeStall, sinceTick.restart()); });
+        const int widthBefore = dialog.importlog->viewport()->width();
+        resizeTick.start(10);
+        sinceTick.restart();
+        dialog.importlog->setFixedWidth(dialog.importlog->width() - 60);
+        QElapsedTimer settle;
+        settle.start();
+        int lastMaximum = -1;
+        QElapsedTimer stable;
+        stable.start();
+        while (settle.elapsed() < 30000 && stable.elapsed() < 500) {
+            QCoreApplication::processEvents(QEventLoop::WaitForMoreEvents, 20);
+            if (bar->maximum() != lastMaximum) {
+                lastMaximum = bar->maximum();
+                stable.restart();
+            }
+        }
+        resizeStall = std::max(resizeStall, sinceTick.elapsed());
+        resizeTick.stop();
+        if (dialog.importlog->viewport()->width() >= widthBefore)
+            qFatal("the log did not get narrower");
+
         const QString text = dialog.importlog->toPlainText();
         QStringList lines = text.split(QLatin1Char('\n'));
         lines.removeAll(QString());
         const QString last = lines.isEmpty() ? QString() : lines.last().left(60);
-        std::printf("%-8g %-6s %12lld %14lld %12lld  %s\n", mb, rich ? "rich" : "plain", shown, longest,
-                    qint64(text.count(QLatin1Char('\n')) + 1), qPrintable(last));
+        std::printf("%-8g %-6s %12lld %14lld %10lld %13lld %12lld  %s\n", mb, rich ? "rich" : "plain", shown,
+                    longest, jump, resizeStall, qint64(text.count(QLatin1Char('\n')) + 1), qPrintable(last));
         std::fflush(stdout);
     }
     return 0;
