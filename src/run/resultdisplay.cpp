@@ -212,22 +212,12 @@ void appendResult(QTextDocument *doc, const AppendFormats &formats, const Result
 // each takes a few dozen milliseconds.
 constexpr qsizetype pieceChars = 128 * 1024;
 
-// The same font, but not shared with other copies: a font caches its glyph engine for one thread
-// at a time, and two threads laying out text in fonts that share it would keep replacing it.
-QFont unsharedFont(const QFont &font)
-{
-    QFont own = font;
-    own.setStyleStrategy(font.styleStrategy()); // makes a copy of its own
-    own.setResolveMask(font.resolveMask());
-    return own;
-}
-
 // An empty document that lays text out as `doc` does.
 QTextDocument *emptyLike(const QTextDocument *doc)
 {
     auto *piece = new QTextDocument;
     piece->setUndoRedoEnabled(false);
-    piece->setDefaultFont(unsharedFont(doc->defaultFont()));
+    piece->setDefaultFont(doc->defaultFont());
     piece->setDefaultTextOption(doc->defaultTextOption());
     piece->setIndentWidth(doc->indentWidth());
     piece->setDocumentMargin(doc->documentMargin());
@@ -317,9 +307,11 @@ void showNow(QTextEdit *log, const ResultSource &source)
 }
 
 // A larger result: the log's text with the result appended is built in a copy of the log's
-// document on a worker thread; the copy then replaces the log's document. A plain result is also
-// laid out there, in two pieces on two threads at once (see StackedTextLayout); a rich one is laid
-// out in slices from the event loop. Lives as a child of the log, so it never outlives it.
+// document on a worker thread; the copy then replaces the log's document. A plain result is
+// shown in pieces (see StackedTextLayout), made on a second worker at the same time: the first,
+// with the log's earlier text, laid out there, the others laid out when they come into view. A
+// rich result is laid out in slices from the event loop. Lives as a child of the log, so it never
+// outlives it.
 class ResultDisplayJob : public QObject
 {
 public:
@@ -389,7 +381,6 @@ ResultDisplayJob::ResultDisplayJob(QTextEdit *log, ResultSource source)
     m_copy->setUndoRedoEnabled(false);
     m_firstPiece = doc->clone();
     m_firstPiece->setUndoRedoEnabled(false);
-    m_firstPiece->setDefaultFont(unsharedFont(doc->defaultFont()));
     m_pieceModel = emptyLike(doc);
 
     // Anyone else changing the log meanwhile makes the copy stale: the display then gives way.

@@ -10,8 +10,9 @@ class QTextEdit;
 // Returns false, showing nothing, when the file can be neither opened nor created.
 //
 // A result up to resultShownNowBytes is complete when this returns. A larger one is prepared off
-// the GUI thread and laid out in slices from the event loop, so that the dialog never stops for
-// long; until it is done, resultDisplayBusy() is true. Of a result larger than the log can take
+// the GUI thread, so that the dialog never stops for long: a plain one is then shown in pieces
+// laid out as they come into view, a rich one is laid out in slices from the event loop. Until
+// it is shown, resultDisplayBusy() is true. Of a result larger than the log can take
 // (more than 10 MiB, or a paragraph or total height the text layout cannot handle in time), the
 // log shows the first part and then an error line that names the file.
 bool showResultFile(QTextEdit *log, const QString &path);
