@@ -12,6 +12,8 @@
 # Usage:  bash scripts/desktop-check.sh [rutile.cif | nacl.cif | quartz.in]     (default rutile.cif)
 #   MORVEL_BUILD_DIR   build folder (default: build/)
 #   MORVEL_SCREENSHOT  where the PNG goes (default: <build folder>/desktop-check.png)
+#   MORVEL_PAD_RESULT_MB  when set, MORVEL.OUT gets that many MB of extra distance lines before its last
+#                      line (a large result), and a third screenshot shows the log scrolled back up a way
 # Needs: Xvfb, xdotool, ImageMagick (apt-get install xvfb xdotool imagemagick).
 set -euo pipefail
 root=$(cd "$(dirname "$0")/.." && pwd)
@@ -77,7 +79,24 @@ step "demo copy with the installed stand-ins"
 work=$tmp/work
 mkdir "$work"
 cp -r "$root/demo/." "$work/"
-ln -s "$prefix/bin/morvel" "$work/morvel"
+if [ -n "${MORVEL_PAD_RESULT_MB:-}" ]; then
+  # The stand-in's own result with distance lines added before its last line.
+  {
+    echo '#!/usr/bin/env bash'
+    echo "\"$prefix/bin/morvel\" \"\$@\" || exit"
+    echo "pad=$((MORVEL_PAD_RESULT_MB * 1000000 / 36))"
+    cat <<'WRAP'
+last=$(tail -n 1 MORVEL.OUT)
+head -n -1 MORVEL.OUT >MORVEL.OUT.body
+awk -v n="$pad" 'BEGIN { for (i = 0; i < n; i++) printf "  Ti1   - O%d      1.9%06d(3)  x2\n", i % 7, i }' >>MORVEL.OUT.body
+echo "$last" >>MORVEL.OUT.body
+mv MORVEL.OUT.body MORVEL.OUT
+WRAP
+  } >"$work/morvel"
+  chmod +x "$work/morvel"
+else
+  ln -s "$prefix/bin/morvel" "$work/morvel"
+fi
 ln -s "$prefix/bin/cif_parser" "$work/cif_parser"
 
 # The Exec= value without field codes (%f, %U, ...), split into words as a launcher does.
@@ -172,6 +191,13 @@ sleep 0.7
 shot_end=${shot%.png}-log-end.png
 import -window root "$shot_end"
 step "screenshot, log scrolled to its end: $shot_end"
+if [ -n "${MORVEL_PAD_RESULT_MB:-}" ]; then
+  xdotool mousemove --window "$wid" "$log_x" "$log_y" click --repeat 300 --delay 2 4
+  sleep 0.7
+  shot_up=${shot%.png}-log-up.png
+  import -window root "$shot_up"
+  step "screenshot, log scrolled back up a way: $shot_up"
+fi
 echo "message boxes answered: $answered"
 [ -f "$work/${input%%.*}_old.cif" ] && echo "completed from oxidation.dat; original kept as ${input%%.*}_old.cif"
 echo "result (MORVEL.OUT), first site:"
