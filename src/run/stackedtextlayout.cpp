@@ -90,7 +90,8 @@ std::optional<QSizeF> StackedTextLayout::sizeWithoutLayout(const QTextDocument *
 {
     const qreal pageWidth = piece->pageSize().width();
     const QTextBlock first = piece->begin();
-    if (pageWidth <= 0 || !first.isValid())
+    const QTextOption::WrapMode wrap = piece->defaultTextOption().wrapMode();
+    if (pageWidth <= 0 || !first.isValid() || wrap == QTextOption::NoWrap || wrap == QTextOption::ManualWrap)
         return std::nullopt;
     const QTextBlockFormat blockFormat = first.blockFormat();
     const QTextCharFormat charFormat = first.charFormat();
@@ -466,26 +467,53 @@ void StackedTextLayout::scheduleFollowSettings()
 void StackedTextLayout::followSettings()
 {
     const QTextDocument *doc = document();
+    bool changed = false;
     for (const Piece &piece : std::as_const(m_pieces)) {
         QTextDocument *p = piece.doc;
-        if (p->defaultFont() != doc->defaultFont())
+        if (p->defaultFont() != doc->defaultFont()) {
             p->setDefaultFont(doc->defaultFont());
-        if (!sameOption(p->defaultTextOption(), doc->defaultTextOption()))
+            changed = true;
+        }
+        if (!sameOption(p->defaultTextOption(), doc->defaultTextOption())) {
             p->setDefaultTextOption(doc->defaultTextOption());
-        if (p->indentWidth() != doc->indentWidth())
+            changed = true;
+        }
+        if (p->indentWidth() != doc->indentWidth()) {
             p->setIndentWidth(doc->indentWidth());
-        if (p->pageSize() != doc->pageSize())
+            changed = true;
+        }
+        if (p->pageSize() != doc->pageSize()) {
             p->setPageSize(doc->pageSize());
+            changed = true;
+        }
     }
-    // A piece still waiting to be shown knows its new size without a layout, or gets laid out.
-    for (int k = 0; k < m_pieces.size(); ++k) {
-        if (m_pieces.at(k).laidOut)
+    if (!changed)
+        return;
+    // A piece still waiting to be shown knows its new size without a layout, or gets laid out
+    // in the background, one piece per turn of the event loop.
+    bool unknown = false;
+    for (Piece &piece : m_pieces) {
+        if (piece.laidOut)
             continue;
-        if (const std::optional<QSizeF> size = sizeWithoutLayout(m_pieces.at(k).doc))
-            m_pieces[k].size = *size;
-        else
-            laidOutPiece(k);
+        const std::optional<QSizeF> size = sizeWithoutLayout(piece.doc);
+        piece.sizeKnown = size.has_value();
+        if (size)
+            piece.size = *size;
+        unknown = unknown || !size;
     }
+    if (unknown)
+        QMetaObject::invokeMethod(this, &StackedTextLayout::layOutUnknownPiece, Qt::QueuedConnection);
     restack();
     emit documentSizeChanged(documentSize());
+}
+
+void StackedTextLayout::layOutUnknownPiece()
+{
+    for (int k = 0; k < m_pieces.size(); ++k) {
+        if (!m_pieces.at(k).laidOut && !m_pieces.at(k).sizeKnown) {
+            laidOutPiece(k);
+            QMetaObject::invokeMethod(this, &StackedTextLayout::layOutUnknownPiece, Qt::QueuedConnection);
+            return;
+        }
+    }
 }

@@ -62,6 +62,7 @@ private:
         QSizeF size;      // as its layout last reported it, or as known without it
         qreal top = 0;    // where its own origin lies in the document
         bool laidOut = false;
+        bool sizeKnown = true; // false: a guess until it is laid out
     };
 
     explicit StackedTextLayout(QTextDocument *doc);
@@ -73,6 +74,7 @@ private:
     bool appendToLastPiece(int from, int charsAdded);
     void scheduleFollowSettings();
     void followSettings();
+    void layOutUnknownPiece();
     int pieceEnd(int k) const;
     int pieceAtPosition(int position) const;
     int pieceAtBlock(int blockNumber) const;

@@ -233,11 +233,13 @@ void TestStackedLayout::waitingPiecesFollowWidth()
         m_stacked->resize(width, 300);
         QTest::qWait(50);
         m_reference->document()->documentLayout()->documentSize();
-        QTest::qWait(50);
-        QCOMPARE(m_stacked->document()->documentLayout()->documentSize(),
-                 m_reference->document()->documentLayout()->documentSize());
+        if (width == 300) // the lines no longer fit: the pieces get laid out, in the background
+            QTRY_COMPARE(m_layout->piecesLaidOut(), m_layout->pieceCount());
+        else
+            QVERIFY(m_layout->piecesLaidOut() < m_layout->pieceCount());
+        QTRY_COMPARE(m_stacked->document()->documentLayout()->documentSize(),
+                     m_reference->document()->documentLayout()->documentSize());
     }
-    QCOMPARE(m_layout->piecesLaidOut(), m_layout->pieceCount());
     settle(*m_reference, *m_stacked);
     compare(__LINE__);
 }
