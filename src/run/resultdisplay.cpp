@@ -462,6 +462,7 @@ void ResultDisplayJob::buildCopy()
 void ResultDisplayJob::buildLaterPieces()
 {
     m_prepared.acquire();
+    PieceSizer sizer;
     for (qsizetype k = 0; k < m_laterTexts.size(); ++k) {
         const bool last = k + 1 == m_laterTexts.size();
         QTextDocument *piece = emptyLike(m_pieceModel);
@@ -478,7 +479,7 @@ void ResultDisplayJob::buildLaterPieces()
         else if (!m_endLine.isEmpty())
             appendHtml(piece, m_formats, m_endLine);
         piece->setPageSize(QSizeF(m_pageWidth, -1));
-        if (!StackedTextLayout::prepareWithoutLayout(piece))
+        if (!StackedTextLayout::prepareWithoutLayout(piece, sizer))
             layOut(piece, m_pageWidth);
         piece->moveToThread(thread());
         m_laterPieces.append(piece);

@@ -78,15 +78,15 @@ constexpr int layoutAtOnceChars = 256 * 1024;
 
 StackedTextLayout::StackedTextLayout(QTextDocument *doc) : QAbstractTextDocumentLayout(doc) {}
 
-bool StackedTextLayout::prepareWithoutLayout(QTextDocument *piece)
+bool StackedTextLayout::prepareWithoutLayout(QTextDocument *piece, PieceSizer &sizer)
 {
-    const std::optional<QSizeF> size = sizeWithoutLayout(piece);
+    const std::optional<QSizeF> size = sizer.sizeOf(piece);
     if (size)
         piece->setProperty(sizeProperty, *size);
     return size.has_value();
 }
 
-std::optional<QSizeF> StackedTextLayout::sizeWithoutLayout(const QTextDocument *piece)
+std::optional<QSizeF> PieceSizer::sizeOf(const QTextDocument *piece)
 {
     const qreal pageWidth = piece->pageSize().width();
     const QTextBlock first = piece->begin();
@@ -143,23 +143,27 @@ std::optional<QSizeF> StackedTextLayout::sizeWithoutLayout(const QTextDocument *
         ++lines;
     }
 
-    // The height of one line and of the rest, from a sample laid out as the piece would be.
-    QTextDocument sample;
-    sample.setDefaultFont(piece->defaultFont());
-    sample.setDefaultTextOption(piece->defaultTextOption());
-    sample.setDocumentMargin(piece->documentMargin());
-    sample.rootFrame()->setFrameFormat(frame);
-    sample.setPageSize(piece->pageSize());
-    QTextCursor cursor(&sample);
-    cursor.setBlockFormat(blockFormat);
-    cursor.setBlockCharFormat(charFormat);
-    cursor.setCharFormat(charFormat);
-    cursor.insertText(QStringLiteral("x"));
-    const QSizeF one = sample.documentLayout()->documentSize();
-    cursor.insertText(QString(QChar::LineSeparator) + QStringLiteral("x"));
-    const QSizeF two = sample.documentLayout()->documentSize();
-    const qreal lineHeight = two.height() - one.height();
-    return QSizeF(one.width(), one.height() + lineHeight * qreal(lines - 1));
+    if (!m_sample || m_sample->font != piece->defaultFont() || !sameOption(m_sample->option, piece->defaultTextOption())
+        || m_sample->frame != frame || m_sample->page != piece->pageSize() || m_sample->block != blockFormat
+        || m_sample->chars != charFormat) {
+        QTextDocument sample;
+        sample.setDefaultFont(piece->defaultFont());
+        sample.setDefaultTextOption(piece->defaultTextOption());
+        sample.setDocumentMargin(piece->documentMargin());
+        sample.rootFrame()->setFrameFormat(frame);
+        sample.setPageSize(piece->pageSize());
+        QTextCursor cursor(&sample);
+        cursor.setBlockFormat(blockFormat);
+        cursor.setBlockCharFormat(charFormat);
+        cursor.setCharFormat(charFormat);
+        cursor.insertText(QStringLiteral("x"));
+        const QSizeF one = sample.documentLayout()->documentSize();
+        cursor.insertText(QString(QChar::LineSeparator) + QStringLiteral("x"));
+        const QSizeF two = sample.documentLayout()->documentSize();
+        m_sample = Sample{piece->defaultFont(), piece->defaultTextOption(), frame, piece->pageSize(),
+                          blockFormat, charFormat, one, two.height() - one.height()};
+    }
+    return QSizeF(m_sample->oneLine.width(), m_sample->oneLine.height() + m_sample->lineHeight * qreal(lines - 1));
 }
 
 void StackedTextLayout::closePiece(QTextDocument *piece)
@@ -495,7 +499,7 @@ void StackedTextLayout::followSettings()
     for (Piece &piece : m_pieces) {
         if (piece.laidOut)
             continue;
-        const std::optional<QSizeF> size = sizeWithoutLayout(piece.doc);
+        const std::optional<QSizeF> size = m_sizer.sizeOf(piece.doc);
         piece.sizeKnown = size.has_value();
         if (size)
             piece.size = *size;

@@ -5,7 +5,35 @@
 #include <QList>
 #include <QSizeF>
 
+#include <QFont>
+#include <QTextFormat>
+#include <QTextOption>
+
 #include <optional>
+
+// Knows the exact size Qt's layout gives a piece of a log at its page size without laying it out,
+// when that can be known: one format throughout, only letters of its font, no line wider than the
+// page. Keeps what it measured for the next piece alike.
+class PieceSizer
+{
+public:
+    std::optional<QSizeF> sizeOf(const QTextDocument *piece);
+
+private:
+    // The height of one line and of the rest, measured on a sample laid out as the piece would be.
+    struct Sample
+    {
+        QFont font;
+        QTextOption option;
+        QTextFrameFormat frame;
+        QSizeF page;
+        QTextBlockFormat block;
+        QTextCharFormat chars;
+        QSizeF oneLine;
+        qreal lineHeight = 0;
+    };
+    std::optional<Sample> m_sample;
+};
 
 // Lays a document out as a stack of pieces: copies of consecutive parts of its text, each laid out
 // by Qt's own document layout in a document of its own. Pieces can be laid out on several threads
@@ -25,14 +53,9 @@ public:
     // height after its text, so that a selection can go on over the end of its last paragraph.
     static void closePiece(QTextDocument *piece);
 
-    // Lets a piece wait with its layout until it is shown, when its height can be known without
-    // it: one format throughout, only letters of its font, no line wider than the page. Returns
-    // false, changing nothing, when that is not so: the piece must then be laid out.
-    static bool prepareWithoutLayout(QTextDocument *piece);
-
-    // The exact size Qt's layout gives `piece` at its page size, or nothing when it cannot be
-    // known without laying it out (see prepareWithoutLayout).
-    static std::optional<QSizeF> sizeWithoutLayout(const QTextDocument *piece);
+    // Lets a piece wait with its layout until it is shown, when the sizer knows its size without
+    // it. Returns false, changing nothing, when not: the piece must then be laid out.
+    static bool prepareWithoutLayout(QTextDocument *piece, PieceSizer &sizer);
 
     // Installs the layout on `doc` when the pieces hold its text, taking them over, and returns it;
     // returns nullptr (and deletes the pieces) when they do not. Every piece but the last must be
@@ -84,6 +107,7 @@ private:
     mutable bool m_sizeNewsPending = false;
     bool m_editPending = false;   // the document announced a change of its text
     bool m_followPending = false; // a change of page size or font is still to be passed on
+    PieceSizer m_sizer;
 };
 
 #endif

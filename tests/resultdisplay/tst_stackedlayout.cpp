@@ -128,9 +128,10 @@ void TestStackedLayout::init()
     m_seamBlock = starts.at(1);
     const qreal width = m_reference->viewport()->width();
     QList<QTextDocument *> pieces;
+    PieceSizer sizer;
     for (int k = 0; k + 1 < starts.size(); ++k) {
         pieces.append(pieceOf(doc, starts.at(k), starts.at(k + 1), width));
-        m_prepared += StackedTextLayout::prepareWithoutLayout(pieces.last()) ? 1 : 0;
+        m_prepared += StackedTextLayout::prepareWithoutLayout(pieces.last(), sizer) ? 1 : 0;
     }
     m_layout = StackedTextLayout::install(doc, pieces);
     QVERIFY(m_layout);
