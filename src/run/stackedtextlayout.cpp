@@ -1,6 +1,7 @@
 #include "stackedtextlayout.h"
 
 #include <QFontMetricsF>
+#include <QHash>
 #include <QPainter>
 #include <QTextBlock>
 #include <QTextCursor>
@@ -112,6 +113,24 @@ std::optional<QSizeF> PieceSizer::sizeOf(const QTextDocument *piece)
         advance[c] = letter && metrics.inFont(ch) ? metrics.horizontalAdvance(ch) : -1;
     }
     advance[int('\t')] = tab;
+    // Beyond Latin-1: letters and signs of the font that stand alone (Greek, Cyrillic, symbols);
+    // not marks that combine with the letter before, nor what takes another direction.
+    QHash<char16_t, qreal> otherAdvance;
+    auto advanceOf = [&](char16_t c) -> qreal {
+        if (c <= 0xff)
+            return advance[c];
+        auto it = otherAdvance.constFind(c);
+        if (it != otherAdvance.cend())
+            return *it;
+        const QChar ch(c);
+        const QChar::Direction direction = ch.direction();
+        const bool alone = !ch.isSurrogate() && !ch.isMark() && ch.isPrint() && c != QChar::ReplacementCharacter
+                           && (direction == QChar::DirL || direction == QChar::DirON || direction == QChar::DirEN
+                               || direction == QChar::DirET || direction == QChar::DirES || direction == QChar::DirCS);
+        const qreal width = alone && metrics.inFont(ch) ? metrics.horizontalAdvance(ch) : -1;
+        otherAdvance.insert(c, width);
+        return width;
+    };
 
     qsizetype lines = 0;
     for (QTextBlock block = first; block.isValid(); block = block.next()) {
@@ -134,9 +153,10 @@ std::optional<QSizeF> PieceSizer::sizeOf(const QTextDocument *piece)
                 width = 0;
                 continue;
             }
-            if (c > 0xff || advance[c] < 0)
+            const qreal step = advanceOf(c);
+            if (step < 0)
                 return std::nullopt;
-            width += advance[c];
+            width += step;
             if (width > limit)
                 return std::nullopt;
         }

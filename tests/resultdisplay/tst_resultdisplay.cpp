@@ -178,6 +178,10 @@ void TestResultDisplay::looksLikeOneAppend_data()
     QByteArray hebrew = plainResult(2'000'000);
     hebrew.replace("Fe1", "\xd7\x90\xd7\x91");
     QTest::newRow("plain, right to left, 2 MB") << hebrew;
+    // Greek letters and signs of the log's font need no layout before they are shown either.
+    QByteArray greek = plainResult(2'000'000);
+    greek.replace("x2", "\xce\xb1\xe2\x89\xa4\xc3\x85");
+    QTest::newRow("plain, Greek and signs, 2 MB") << greek;
     QTest::newRow("rich, 10 MB") << richResult(10'000'000);
 }
 
