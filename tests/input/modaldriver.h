@@ -33,6 +33,11 @@ public:
                         + dialog->directory().absolutePath());
             if (path.isEmpty())
                 return dialog->reject();
+            // Once its window is active, the name field has the keyboard focus, and the dialog
+            // then leaves it as it is: the choice would not be taken and the dialog would stay
+            // open. Whether the window is active by now depends on timing.
+            if (QWidget *focused = dialog->focusWidget())
+                focused->clearFocus();
             dialog->selectFile(path);
             static_cast<QDialog *>(dialog)->accept(); // public in QDialog, runs QFileDialog::accept
         });
@@ -80,6 +85,11 @@ private:
         answeredAt.start();
         if (steps.isEmpty())
             return unexpected(w);
+        // Qt does not fire a timer again while its handler runs: a window the answer opens (the
+        // file dialog's own "not found" box) is looked for by another timer, or the test hangs.
+        QTimer nested;
+        connect(&nested, &QTimer::timeout, this, &ModalDriver::poll);
+        nested.start(5);
         steps.takeFirst()(w);
     }
 

@@ -5,6 +5,8 @@
 
 #include <QtTest>
 
+#include <memory>
+
 namespace {
 QString boxLine(const QString &text, const QString &informative, QMessageBox::StandardButtons buttons)
 {
@@ -42,6 +44,8 @@ private slots:
     void workedExampleTwice();
     void inputLeftUnchanged_data();
     void inputLeftUnchanged();
+    void driverAnswers_data();
+    void driverAnswers();
 
 private:
     // Presses Browse; the driver must have met every window it expected, and no other.
@@ -247,6 +251,58 @@ void TestInputFile::inputLeftUnchanged()
     QVERIFY(tmpIsDirectory || !QFile::exists(dir.filePath("tmp.cif")));
     QCOMPARE(shownLines(dialog.importlog).constLast(), lastLine);
     QVERIFY(!dialog.importlog->toHtml().contains("#00cc00"));
+}
+
+void TestInputFile::driverAnswers_data()
+{
+    QTest::addColumn<QString>("name");     // chosen in the file dialog
+    QTest::addColumn<bool>("activeFirst"); // answered only once the dialog's window is active
+    QTest::addColumn<QStringList>("problems");
+    QTest::newRow("window already active") << "x.dat" << true << QStringList();
+    QTest::newRow("missing file") << "gone.dat" << false
+                                  << QStringList{"unexpected QMessageBox", "unexpected QFileDialog"};
+}
+
+// The tests' stand-in for the user: a choice is taken however late it comes, and a window the
+// answer opens is reported instead of hanging the test.
+void TestInputFile::driverAnswers()
+{
+    QFETCH(QString, name);
+    QFETCH(bool, activeFirst);
+    QFETCH(QStringList, problems);
+
+    QTemporaryDir dir;
+    writeFile(dir.filePath("x.dat"), exampleCif);
+    Import dialog;
+    dialog.InputBox->setCurrentIndex(1); // hand-made x.dat: no question follows the choice
+    std::unique_ptr<ModalDriver> driver;
+    auto startDriver = [&] {
+        driver = std::make_unique<ModalDriver>();
+        driver->chooseFile(dir.filePath(name));
+    };
+    bool wasActive = false;
+    QElapsedTimer clock;
+    QTimer late;
+    connect(&late, &QTimer::timeout, this, [&] {
+        QWidget *w = QApplication::activeModalWidget();
+        if (!w || (!w->isActiveWindow() && clock.elapsed() < 2000))
+            return;
+        wasActive = w->isActiveWindow();
+        late.stop();
+        startDriver();
+    });
+    if (activeFirst) {
+        clock.start();
+        late.start(1);
+    } else {
+        startDriver();
+    }
+    dialog.browseinput->click();
+
+    QVERIFY(driver);
+    QCOMPARE(wasActive, activeFirst);
+    QCOMPARE(driver->problems, problems);
+    QCOMPARE(dialog.inputFile, problems.isEmpty() ? dir.filePath(name) : QString());
 }
 
 QTEST_MAIN(TestInputFile)
