@@ -4,7 +4,7 @@
 #   MORVEL_FUZZ_SECONDS   seconds per fuzzer (default 60)
 set -euo pipefail
 root=$(cd "$(dirname "$0")/.." && pwd)
-bash "$root/scripts/deps.sh" clang libclang-rt-14-dev
+bash "$root/scripts/deps.sh" clang libclang-rt-14-dev gdb
 jobs=$(nproc 2>/dev/null || echo 2)
 export QT_QPA_PLATFORM=offscreen
 stages=0
