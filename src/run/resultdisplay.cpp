@@ -149,8 +149,12 @@ struct PreparedResult
     bool whole = true; // false: the log shows only the first part
 };
 
+// Lines are joined into paragraphs (joinLines) only for a large result, where it saves most of
+// the time; a small one keeps a paragraph a line, exactly as one append makes it.
+enum class Lines { AsAppended, Joined };
+
 PreparedResult prepareResult(const ResultSource &source, const AppendFormats &formats,
-                             const LogGeometry &geometry)
+                             const LogGeometry &geometry, Lines lines)
 {
     PreparedResult result;
     result.text = decodeResult(source.bytes, source.complete);
@@ -162,7 +166,7 @@ PreparedResult prepareResult(const ResultSource &source, const AppendFormats &fo
             result.text.truncate(shown);
             result.whole = false;
         }
-        if (linesMayShareParagraphs(formats.block))
+        if (lines == Lines::Joined && linesMayShareParagraphs(formats.block))
             joinLines(result.text);
     }
     return result;
@@ -204,7 +208,7 @@ void appendPrepared(QTextDocument *doc, const AppendFormats &formats, PreparedRe
 void appendResult(QTextDocument *doc, const AppendFormats &formats, const ResultSource &source,
                   const LogGeometry &geometry)
 {
-    PreparedResult result = prepareResult(source, formats, geometry);
+    PreparedResult result = prepareResult(source, formats, geometry, Lines::AsAppended);
     appendPrepared(doc, formats, result, source, geometry);
 }
 
@@ -419,7 +423,7 @@ ResultDisplayJob::~ResultDisplayJob()
 void ResultDisplayJob::buildCopy()
 {
     QThread *gui = thread();
-    m_result = prepareResult(m_source, m_formats, m_geometry);
+    m_result = prepareResult(m_source, m_formats, m_geometry, Lines::Joined);
     const bool plain = !m_result.rich;
     // Pieces meet at paragraph breaks; paragraphs with margins would not meet as in one layout.
     const QList<qsizetype> breaks = plain && linesMayShareParagraphs(m_formats.block)

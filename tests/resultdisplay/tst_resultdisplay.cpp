@@ -168,6 +168,7 @@ void TestResultDisplay::looksLikeOneAppend_data()
     QTest::addColumn<QByteArray>("bytes");
     QTest::newRow("empty") << QByteArray();
     QTest::newRow("one line") << QByteArray("  MORVEL result: 12 sites");
+    QTest::newRow("some lines") << plainResult(20'000);
     QTest::newRow("nul bytes") << QByteArray("before\0\0after\nnext\xff line\n", 25);
     QTest::newRow("rich, small") << richResult(200 * 1024);
     QTest::newRow("plain, 10 MB") << plainResult(10'000'000);
@@ -213,8 +214,11 @@ void TestResultDisplay::looksLikeOneAppend()
     QElapsedTimer clock;
     clock.start();
     QVERIFY(showResultFile(&log, path));
-    if (bytes.size() <= resultShownNowBytes)
+    if (bytes.size() <= resultShownNowBytes) {
         QVERIFY(!resultDisplayBusy(&log));
+        // A small result keeps a paragraph a line, as one append makes it.
+        QCOMPARE(log.document()->blockCount(), reference.document()->blockCount());
+    }
     const qint64 stall = longestStallUntil([&] { return !resultDisplayBusy(&log); }, 120'000);
     QVERIFY(!resultDisplayBusy(&log));
     qInfo("%lld bytes shown in %lld ms, longest stall %lld ms", qint64(bytes.size()),
