@@ -1,6 +1,6 @@
 // Whole demo job benchmark: the dialog against the stand-in programs run directly.
 //   dialog: a click on Run to the result shown in the log (the log laid out and painted), on the
-//           real dialog in a copy of demo/ with the real stand-ins, input chosen once with Browse;
+//           real dialog in a copy of demo/ with the real stand-ins, input chosen once;
 //   direct: the same programs in the same folder started with posix_spawn, one after the other
 //           (no shell), and once more through /bin/sh -c "... && ...", as typed in a shell.
 // Jobs: nacl.cif ("CIF File": cif_parser then morvel) and quartz.in ("Hand-made": copied to
@@ -9,13 +9,13 @@
 // Run:  QT_QPA_PLATFORM=offscreen build/bench/e2e/bench_e2e [jobs per way, default 100]
 // Cross-check of the direct figure, in a demo copy with the stand-ins and a morvel.par beside it:
 //   hyperfine -N --warmup 5 './cif_parser nacl.cif morvel.in' './morvel'
-#include "demofolder.h"
 #include "import.h"
-#include "modaldriver.h"
 
 #include <QApplication>
+#include <QDir>
 #include <QElapsedTimer>
 #include <QEventLoop>
+#include <QTemporaryDir>
 
 #include <algorithm>
 #include <cstdio>
@@ -62,12 +62,26 @@ double msSince(const QElapsedTimer &clock)
     return double(clock.nsecsElapsed()) / 1e6;
 }
 
+// A copy of demo/ with the two stand-ins linked beside binaries.txt, which names them ./morvel and
+// ./cif_parser; it is the current directory, so the dialog reads its configuration there too.
+QString demoCopy(const QTemporaryDir &dir)
+{
+    const QDir demo(QStringLiteral(DEMO_DIR));
+    for (const QString &name : demo.entryList(QDir::Files))
+        QFile::copy(demo.filePath(name), dir.filePath(name));
+    if (!QFile::link(QStringLiteral(CIF_PARSER_PATH), dir.filePath(QStringLiteral("cif_parser")))
+        || !QFile::link(QStringLiteral(MORVEL_PATH), dir.filePath(QStringLiteral("morvel"))))
+        qFatal("cannot place the stand-ins in %s", qPrintable(dir.path()));
+    QDir::setCurrent(dir.path());
+    return dir.path();
+}
+
 // Earlier results pile up as MORVEL.OUT.oldN and the names end at 100: clear them between jobs,
 // outside the timed part. MORVEL.OUT itself stays, so each timed job also keeps the one before.
-void dropKeptResults(const DemoFolder &demo)
+void dropKeptResults(const QString &folder)
 {
-    for (const QString &name : QDir(demo.path()).entryList({QStringLiteral("MORVEL.OUT.old*")}, QDir::Files))
-        QFile::remove(demo.file(name));
+    for (const QString &name : QDir(folder).entryList({QStringLiteral("MORVEL.OUT.old*")}, QDir::Files))
+        QFile::remove(folder + QLatin1Char('/') + name);
 }
 
 class DialogJob
@@ -75,9 +89,11 @@ class DialogJob
 public:
     DialogJob(Import &dialog) : dialog(dialog)
     {
-        // Connected after the dialog's own handler, so this runs once endMorvel has shown the result.
-        QObject::connect(dialog.morvelProcess, &QProcess::finished, &loop, [this] { loop.quit(); });
-        QObject::connect(dialog.importProcess, &QProcess::finished, &loop, [this](int code) {
+        // The dialog's two process objects, the converter's made first. Connected after the
+        // dialog's own handlers, so these run once endMorvel has shown the result.
+        const QList<QProcess *> processes = dialog.findChildren<QProcess *>();
+        QObject::connect(processes.at(1), &QProcess::finished, &loop, [this] { loop.quit(); });
+        QObject::connect(processes.at(0), &QProcess::finished, &loop, [this](int code) {
             if (code != 0)
                 loop.quit();
         });
@@ -106,11 +122,9 @@ private:
 void choose(Import &dialog, int format, const QString &path)
 {
     dialog.InputBox->setCurrentIndex(format);
-    ModalDriver driver;
-    driver.chooseFile(path);
-    dialog.browseinput->click();
-    if (!driver.allAnswered() || dialog.inputFile != path)
-        qFatal("could not choose %s: %s", qPrintable(path), qPrintable(driver.problems.join(", ")));
+    dialog.takeInputFile(path);
+    if (dialog.inputpath->text() != path)
+        qFatal("could not choose %s", qPrintable(path));
 }
 
 void report(const char *job, const Stats &dialog, const Stats &direct, const Stats &shell)
@@ -134,10 +148,9 @@ int main(int argc, char *argv[])
     QApplication app(argc, argv);
     const int jobs = argc > 1 ? std::max(1, atoi(argv[1])) : 100;
 
-    DemoFolder demo(QStringLiteral(DEMO_DIR), QStringLiteral(CIF_PARSER_PATH), QStringLiteral(MORVEL_PATH));
-    if (!demo.error().isEmpty())
-        qFatal("%s", qPrintable(demo.error()));
-    std::printf("demo copy: %s\n", qPrintable(demo.path()));
+    const QTemporaryDir dir;
+    const QString demo = demoCopy(dir);
+    std::printf("demo copy: %s\n", qPrintable(demo));
 
     Import dialog;
     dialog.show();
@@ -146,7 +159,7 @@ int main(int argc, char *argv[])
 
     // CIF file: the converter, then MORVEL.
     {
-        choose(dialog, 0, demo.file(QStringLiteral("nacl.cif")));
+        choose(dialog, 0, demo + QStringLiteral("/nacl.cif"));
         Stats viaDialog, direct, shell;
         for (int i = -3; i < jobs; ++i) { // three warm-up rounds
             dropKeptResults(demo);
@@ -170,7 +183,7 @@ int main(int argc, char *argv[])
 
     // Hand-made: the dialog copies the file to morvel.in; directly that is one file copy.
     {
-        choose(dialog, 1, demo.file(QStringLiteral("quartz.in")));
+        choose(dialog, 1, demo + QStringLiteral("/quartz.in"));
         Stats viaDialog, direct, none;
         for (int i = -3; i < jobs; ++i) {
             dropKeptResults(demo);

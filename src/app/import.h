@@ -10,9 +10,9 @@
 #include "ui_import.h"
 
 class QButtonGroup;
+class QFile;
 
 // The one dialog of the program: the job form, the two child processes and the shared job state.
-// Data members and helper operations are public so that tests can inspect a job step by step.
 class Import : public QDialog, public Ui::Import
 {
     Q_OBJECT
@@ -20,6 +20,10 @@ class Import : public QDialog, public Ui::Import
 public:
     explicit Import(QWidget *parent = nullptr);
     ~Import() override;
+
+    // Takes fileName as the input file, exactly as if Browse had returned it: for a file given on
+    // the command line or dropped on the dialog. Nothing happens while a program runs.
+    void takeInputFile(const QString &fileName);
 
 public slots:
     void getInputFile();
@@ -35,16 +39,22 @@ public slots:
     void help();
     void openMorvelOut();
 
-public:
+private:
     void resetForm();
     void connectSignals();
     void readToolConfiguration();
+    void checkOxidationNumbers(QFile &input);
     void readOxidationTable();
     void addOxidationNumbers();
-    OxidationEntry entryForName(const QString &key) const;
-    float chargeForSymbol(const QString &symbol) const;
-    void writeParameterFile();
-    void copyInputFile(const QString &inputPath);
+    bool writeParameterFile();
+    bool copyInputFile(const QString &inputPath);
+
+    // The job's state decides the buttons, in one place: while a program runs, Run and Browse
+    // are off (the run keeps its folder and files until it ends) and Kill is on.
+    bool programRuns() const;
+    void updateButtons();
+    void startChild(QProcess *process, const QString &program, const QStringList &arguments);
+    void reportConverterError();
 
     QButtonGroup *printGroup = nullptr;
     QString parserProgram;
@@ -56,23 +66,9 @@ public:
     QString versionText;
     QProcess *importProcess = nullptr;
     QProcess *morvelProcess = nullptr;
-    float dmax = 0.0f;
-    float tolerance = 0.0f;
-    float hbondThreshold = 0.0f;
-    int inputFormat = 0;
-    int outputLevel = 0;
-    int polyhedraDetails = 0;
-    int maxVAtoms = 0;
-    int printType = 0;
     bool importError = false;
     QByteArray converterOutputTail; // the end of the converter's last output, see outputImport
     QList<OxidationEntry> oxidationTable;
-
-    // --- Job run: state tracking of the two child programs (src/run) ---
-private:
-    bool programRuns() const;
-    void updateRunButtons();
-    void startChild(QProcess *process, const QString &program, const QStringList &arguments);
 };
 
 #endif

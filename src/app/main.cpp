@@ -1,7 +1,9 @@
+#include "filedrop.h"
 #include "import.h"
 
 #include <QApplication>
 #include <QIcon>
+#include <QTimer>
 #include <cstdio>
 #include <cstdlib>
 
@@ -28,5 +30,8 @@ int main(int argc, char *argv[])
     // grows so that no label is cut.
     dialog.resize(dialog.size().expandedTo(dialog.sizeHint()));
     dialog.show();
+    // A file given on the command line (a file manager's "Open with") is taken once the window is up.
+    const QStringList files = app.arguments().mid(1);
+    QTimer::singleShot(0, &dialog, [&dialog, files] { takeStartupFiles(dialog, files); });
     return app.exec();
 }

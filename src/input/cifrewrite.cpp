@@ -1,8 +1,10 @@
 #include "cifrewrite.h"
-#include "linereader.h"
-#include "logstyle.h"
+#include "atomtypes.h"
+#include "numbertext.h"
 
-#include "stringindex.h"
+#include <QSet>
+#include <QIODevice>
+#include <QTextStream>
 
 namespace {
 // A tag compared the way the rewriting compares them: white space folded and trimmed.
@@ -18,19 +20,64 @@ bool endsAtomRows(const QString &line)
         || t.startsWith(QLatin1Char('#'));
 }
 
-// Atom row fields: single spaces separate, runs count as one; tabs do not separate.
-QList<QStringView> rowFields(const QString &row)
+// The atom rows with the table's symbols in place of the type symbols, and what the user is told.
+struct AtomRows
 {
-    return QStringView(row).split(QLatin1Char(' '), Qt::SkipEmptyParts, Qt::CaseSensitive);
+    QStringList rows;
+    QStringList symbols; // in order of first use, each once
+    QStringList said;    // one line per kept row; two per incorrect row
+    QStringList unmatchedLabels;
+};
+
+AtomRows rewriteAtomRows(const QStringList &atomRows, const OxidationIndex &index)
+{
+    AtomRows r;
+    QSet<QString> known;
+    for (const QString &row : atomRows) {
+        // Single spaces separate, runs count as one; tabs do not separate.
+        const QList<QStringView> fields = QStringView(row).split(QLatin1Char(' '), Qt::SkipEmptyParts);
+        if (fields.size() < 2) {
+            r.said.append(QStringLiteral("<br><b> The following atom line is probably incorrect : </b>"));
+            r.said.append(row);
+            continue;
+        }
+        // By label first, then by the type symbol taken as a name.
+        OxidationEntry entry = index.entryForName(fields.at(0).trimmed().toString());
+        if (entry.charge > noMatchAbove)
+            entry = index.entryForName(fields.at(1).trimmed().toString());
+        if (entry.charge > noMatchAbove) {
+            r.unmatchedLabels.append(fields.at(0).toString());
+            continue;
+        }
+        const QString label = fields.at(0).toString();
+        r.said.append(QLatin1String(" Atom ") + label + QLatin1String(" has symbol ") + entry.symbol
+                      + QLatin1String(" and charge ") + realText(entry.charge));
+        // The row again, its fields one space apart, with the table's symbol as the second.
+        QString rewritten = label + QLatin1Char(' ') + entry.symbol;
+        for (qsizetype i = 2; i < fields.size(); ++i) {
+            rewritten += QLatin1Char(' ');
+            rewritten += fields.at(i);
+        }
+        r.rows.append(rewritten);
+        if (!known.contains(entry.symbol)) {
+            known.insert(entry.symbol);
+            r.symbols.append(entry.symbol);
+        }
+    }
+    return r;
 }
 
-const float noMatchAbove = 100.0f;
+QString leftUnchanged(const QString &why)
+{
+    return LogStyle::error(QLatin1Char(' ') + why + QStringLiteral(" The input file is left unchanged. "));
+}
 } // namespace
 
 CifSections splitCifText(const QString &text)
 {
     CifSections s;
-    LineReader in(text);
+    QString source = text;
+    QTextStream in(&source, QIODevice::ReadOnly);
 
     for (;;) {
         if (in.atEnd()) {
@@ -42,6 +89,7 @@ CifSections splitCifText(const QString &text)
         if (isTag(s.head.constLast(), QLatin1String("_atom_site_label")))
             break;
     }
+    s.labelLine = s.head.size() - 1;
 
     s.head.append(in.readLine());
     if (!isTag(s.head.constLast(), QLatin1String("_atom_site_type_symbol"))) {
@@ -57,9 +105,7 @@ CifSections splitCifText(const QString &text)
     // The first line after the tags is a row whatever it holds.
     s.atomRows.append(line);
 
-    for (;;) {
-        if (in.atEnd())
-            break;
+    while (!in.atEnd()) {
         line = in.readLine();
         if (endsAtomRows(line)) {
             s.hasEndLine = true;
@@ -76,94 +122,6 @@ CifSections splitCifText(const QString &text)
     return s;
 }
 
-AtomRowRewrite rewriteAtomRows(const QStringList &atomRows, const OxidationIndex &index)
-{
-    AtomRowRewrite r;
-    r.rows.reserve(atomRows.size());
-    r.log.reserve(atomRows.size() + 1);
-    r.log.append(QStringLiteral("<br><b> Now identifying pairs atom symbol/atom names : </b>"));
-    StringIndex known;
-
-    ChargeTexts charges;
-    for (const QString &row : atomRows) {
-        const QList<QStringView> fields = rowFields(row);
-        if (fields.size() < 2) {
-            r.log.append(QStringLiteral("<br><b> The following atom line is probably incorrect : </b>"));
-            r.log.append(row);
-            continue;
-        }
-        // By label first, then by the type symbol taken as a name.
-        OxidationEntry entry = index.entryForName(fields.at(0).trimmed());
-        if (entry.charge > noMatchAbove)
-            entry = index.entryForName(fields.at(1).trimmed());
-        if (entry.charge > noMatchAbove) {
-            r.unmatchedLabels.append(fields.at(0).toString());
-            continue;
-        }
-        QString said = QStringLiteral(" Atom ");
-        said += fields.at(0);
-        said += QLatin1String(" has symbol ") + entry.symbol + QLatin1String(" and charge ") + charges.text(entry.charge);
-        r.log.append(said);
-        // The row again, its fields one space apart, with the table's symbol as the second.
-        QString rewritten;
-        rewritten.reserve(row.size() + entry.symbol.size());
-        rewritten += fields.at(0);
-        rewritten += QLatin1Char(' ');
-        rewritten += entry.symbol;
-        for (qsizetype i = 2; i < fields.size(); ++i) {
-            rewritten += QLatin1Char(' ');
-            rewritten += fields.at(i);
-        }
-        r.rows.append(rewritten);
-        if (known.insert(entry.symbol, 0))
-            r.symbols.append(entry.symbol);
-    }
-
-    if (!r.unmatchedLabels.isEmpty()) {
-        r.log.append(QStringLiteral("<br><b><font color=#FF3300> WARNING ! </font></b>"));
-        r.log.append(QStringLiteral("<b>The following atoms do not have any match in \"oxidation.dat\" file : </b>"));
-        r.log.append(r.unmatchedLabels);
-    }
-    return r;
-}
-
-QString composeCifText(const CifSections &sections, const AtomRowRewrite &rows, const OxidationIndex &index)
-{
-    QStringList symbolRows;
-    symbolRows.reserve(rows.symbols.size());
-    ChargeTexts charges;
-    for (const QString &symbol : rows.symbols)
-        symbolRows.append(symbol + QLatin1Char(' ') + charges.text(index.chargeForSymbol(symbol)));
-    const QStringList inserted{QStringLiteral("loop_"), QStringLiteral("_atom_type_symbol"),
-                               QStringLiteral("_atom_type_oxidation_number")};
-
-    const QStringList *parts[] = {&sections.head, &rows.rows, &inserted, &symbolRows, &sections.rest};
-    qsizetype size = sections.endLine.size() + 1;
-    for (const QStringList *part : parts) {
-        for (const QString &line : *part)
-            size += line.size() + 1;
-    }
-
-    QString text;
-    text.reserve(size);
-    auto put = [&text](const QStringList &lines) {
-        for (const QString &line : lines) {
-            text += line;
-            text += QLatin1Char('\n');
-        }
-    };
-    put(sections.head);
-    put(rows.rows);
-    put(inserted);
-    put(symbolRows);
-    if (sections.hasEndLine) {
-        text += sections.endLine;
-        text += QLatin1Char('\n');
-    }
-    put(sections.rest);
-    return text;
-}
-
 CifRewrite rewriteCifText(const QString &text, const OxidationIndex &index)
 {
     CifRewrite result;
@@ -171,28 +129,75 @@ CifRewrite rewriteCifText(const QString &text, const OxidationIndex &index)
     switch (sections.status) {
     case CifSections::Status::NoAtomSiteLabel:
         result.outcome = CifRewrite::Outcome::NoAtomSiteLabel;
-        result.log.append(LogStyle::error(
-            QStringLiteral(" The CIF file does not contain the flag \"_atom_site_label\" ! The input file is left unchanged. ")));
+        result.log = {{leftUnchanged(QStringLiteral("The CIF file does not contain the flag \"_atom_site_label\" !"))}};
         return result;
     case CifSections::Status::NoTypeSymbol:
         result.outcome = CifRewrite::Outcome::NoTypeSymbol;
-        // Shown as it always was: this line has no closing tags.
-        result.log.append(QStringLiteral(
-            "<br><b><font color=#FF3300> The CIF file must at least contain the flag \"_atom_site_type_symbol\" !"));
+        result.log = {{LogStyle::error(
+            QStringLiteral(" The CIF file must at least contain the flag \"_atom_site_type_symbol\" !"),
+            LogStyle::BreakBefore | LogStyle::Unclosed)}};
         return result;
     case CifSections::Status::Complete:
         break;
     }
 
-    AtomRowRewrite rows = rewriteAtomRows(sections.atomRows, index);
-    result.log = std::move(rows.log);
+    const AtomRows rows = rewriteAtomRows(sections.atomRows, index);
+    result.log = {{QStringLiteral("<br><b> Now identifying pairs atom symbol/atom names : </b>")}, rows.said};
+    if (!rows.unmatchedLabels.isEmpty()) {
+        result.log.append({LogStyle::error(QStringLiteral(" WARNING ! "), LogStyle::BreakBefore),
+                           QStringLiteral("<b>The following atoms do not have any match in \"oxidation.dat\" file : </b>")});
+        result.log.append(rows.unmatchedLabels);
+    }
     if (rows.rows.isEmpty()) {
         // Writing now would drop every atom of the structure.
         result.outcome = CifRewrite::Outcome::NoAtomKept;
-        result.log.append(LogStyle::error(
-            QStringLiteral(" No atom line matches \"oxidation.dat\" file ! The input file is left unchanged. ")));
+        result.log.append({leftUnchanged(QStringLiteral("No atom line matches \"oxidation.dat\" file !"))});
         return result;
     }
-    result.text = composeCifText(sections, rows, index);
+
+    QStringList lines = sections.head + rows.rows;
+    const qsizetype afterRows = lines.size();
+    if (sections.hasEndLine)
+        lines.append(sections.endLine);
+    lines += sections.rest;
+
+    const AtomTypeItems items = findAtomTypeItems(lines, sections.labelLine);
+    switch (items.kind) {
+    case AtomTypeItems::Kind::None: {
+        QStringList loop{QStringLiteral("loop_"), QStringLiteral("_atom_type_symbol"),
+                         QStringLiteral("_atom_type_oxidation_number")};
+        for (const QString &symbol : rows.symbols)
+            loop.append(symbol + QLatin1Char(' ') + realText(index.chargeForSymbol(symbol)));
+        for (qsizetype i = 0; i < loop.size(); ++i)
+            lines.insert(afterRows + i, loop.at(i));
+        break;
+    }
+    case AtomTypeItems::Kind::Loop: {
+        // A CIF must not name an item twice: the block's own atom-type loop gets the numbers.
+        QStringList rowValues;
+        for (const QString &symbol : items.rowSymbols) {
+            const float charge = index.chargeForSymbol(symbol);
+            rowValues.append(charge > noMatchAbove ? QStringLiteral("?") : realText(charge));
+        }
+        QStringList newRows;
+        for (const QString &symbol : rows.symbols) {
+            if (items.rowSymbols.contains(symbol))
+                continue;
+            QStringList fields(items.columns, QStringLiteral("?"));
+            fields[items.symbolColumn] = symbol;
+            newRows.append(fields.join(QLatin1Char(' ')) + QLatin1Char(' ')
+                           + realText(index.chargeForSymbol(symbol)));
+        }
+        addOxidationColumn(lines, items, rowValues, newRows);
+        break;
+    }
+    case AtomTypeItems::Kind::NotUnderstood:
+        result.outcome = CifRewrite::Outcome::AtomTypesNotUnderstood;
+        result.log.append({leftUnchanged(QStringLiteral(
+            "The \"_atom_type_\" items of the CIF file are not one loop that oxidation numbers can be added to !"))});
+        return result;
+    }
+
+    result.text = lines.join(QLatin1Char('\n')) + QLatin1Char('\n');
     return result;
 }

@@ -1,6 +1,7 @@
 #ifndef MORVEL_CIFREWRITE_H
 #define MORVEL_CIFREWRITE_H
 
+#include "logstyle.h"
 #include "oxidationtable.h"
 
 #include <QStringList>
@@ -14,6 +15,7 @@ struct CifSections
 
     Status status = Status::Complete;
     QStringList head;     // up to and including the last tag line of the atom-site loop
+    qsizetype labelLine = -1; // the "_atom_site_label" line, in head
     QStringList atomRows; // the loop's data lines, untrimmed
     bool hasEndLine = false;
     QString endLine;      // the line that ended the atom rows, if they did not run to the end
@@ -22,31 +24,17 @@ struct CifSections
 
 CifSections splitCifText(const QString &text);
 
-// The atom rows with the table's symbols in place of the type symbols, and what the user is
-// told about them: the pairing header, one line per kept row, the incorrect rows and the
-// warning block about rows without a match.
-struct AtomRowRewrite
-{
-    QStringList rows;
-    QStringList unmatchedLabels;
-    QStringList symbols; // in order of first use, each once
-    QStringList log;
-};
-
-AtomRowRewrite rewriteAtomRows(const QStringList &atomRows, const OxidationIndex &index);
-
-// The new file's text: head, rewritten rows, the inserted atom-type loop, end line and rest,
-// every line ended by a single LF.
-QString composeCifText(const CifSections &sections, const AtomRowRewrite &rows, const OxidationIndex &index);
-
-// The whole rewriting of a CIF text. Only a Rewritten outcome carries a text to write; any other
-// outcome means the file must stay as it is. The log lines are in the order they are shown.
+// The whole rewriting of a CIF text: the atom rows get the table's symbols (rows without a match
+// are left out), and the block gets the oxidation number of each symbol, in a new atom-type loop
+// after the atom rows or, where the block has an atom-type loop already, in a new column of it.
+// Only a Rewritten outcome carries a text to write, every line ended by a single LF; any other
+// outcome means the file must stay as it is.
 struct CifRewrite
 {
-    enum class Outcome { Rewritten, NoAtomSiteLabel, NoTypeSymbol, NoAtomKept };
+    enum class Outcome { Rewritten, NoAtomSiteLabel, NoTypeSymbol, NoAtomKept, AtomTypesNotUnderstood };
 
     Outcome outcome = Outcome::Rewritten;
-    QStringList log;
+    LogGroups log;
     QString text;
 };
 

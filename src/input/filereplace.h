@@ -16,7 +16,26 @@ enum class ReplaceResult {
 
 ReplaceResult replaceFileContent(const QString &temporaryPath, const QByteArray &content, const QString &targetPath);
 
-// Renames from over to, replacing an existing to in one step (QFile::rename refuses to).
-bool renameReplacing(const QString &from, const QString &to);
+// A file the dialog writes anew (morvel.par, morvel.in): an earlier file is removed, the new one
+// is opened read-write and emptied (so that an old file that could not be removed keeps no
+// tail), then written. Written means that every byte reached the file.
+enum class WriteResult { Written, CannotOpen, CannotWrite };
+
+WriteResult writeNewFile(const QString &path, const QByteArray &content);
+
+// Keeps a copy of bytes (a file about to be rewritten) in dir, under the first of the names
+// backupFileName(baseName, 1 to 100) that is free or already holds exactly these bytes. An
+// existing file is never overwritten. name is empty when no copy could be kept.
+struct BackupCopy
+{
+    QString name;
+    bool madeNow = false;
+};
+
+BackupCopy keepBackupCopy(const QString &dir, const QString &baseName, const QByteArray &bytes);
+
+// The whole content of a file, opened read-write as every file of the program (so a missing
+// one is created empty); false when it cannot be opened.
+bool readWholeFile(const QString &path, QByteArray &content);
 
 #endif

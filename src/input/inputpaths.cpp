@@ -17,17 +17,27 @@ InputPaths inputPathsFor(const QString &inputFile)
     return paths;
 }
 
-bool suffixMentionsCif(const QString &fileName)
+bool hasCifSuffix(const QString &fileName, CifSuffix test)
 {
-    return QFileInfo(fileName).completeSuffix().toLower().contains(QLatin1String("cif"));
+    const QFileInfo info(fileName);
+    const QLatin1String cif("cif");
+    switch (test) {
+    case CifSuffix::CompleteSuffixContains:
+        return info.completeSuffix().toLower().contains(cif);
+    case CifSuffix::CompleteSuffixIs:
+        return info.completeSuffix().toLower() == cif;
+    case CifSuffix::SuffixIs:
+        return info.suffix().toLower() == cif;
+    }
+    return false;
 }
 
-bool suffixIsCif(const QString &fileName)
+QString backupFileName(const QString &baseName, int n)
 {
-    return QFileInfo(fileName).completeSuffix().toLower() == QLatin1String("cif");
+    return baseName + QLatin1String("_old") + (n > 1 ? QString::number(n) : QString()) + QLatin1String(".cif");
 }
 
-QString backupFileName(const QString &baseName)
+bool isStagedInputName(const QString &inputFile)
 {
-    return baseName + QLatin1String("_old.cif");
+    return QFileInfo(inputFile).fileName().toLower().trimmed() == QLatin1String("morvel.in");
 }

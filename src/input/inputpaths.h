@@ -13,14 +13,21 @@ struct InputPaths
 
 InputPaths inputPathsFor(const QString &inputFile);
 
-// The lower-cased complete suffix (all after the first dot of the name) contains "cif": used to
-// warn about a file that does not suit the chosen format.
-bool suffixMentionsCif(const QString &fileName);
+// The three ways the dialog asks whether a file name looks like a CIF file, each lower-cased:
+// - CompleteSuffixContains: all after the first dot contains "cif" (a.cif.txt, a.tar.cif): a file
+//   that fails it gets the format warning when "CIF File" is chosen, one that passes it gets the
+//   other warning when another format is chosen;
+// - CompleteSuffixIs: all after the first dot is "cif" (a.cif, not a.b.cif): only such a file gets
+//   the oxidation-number check;
+// - SuffixIs: all after the last dot is "cif" (a.b.cif too): Run asks before converting any other.
+enum class CifSuffix { CompleteSuffixContains, CompleteSuffixIs, SuffixIs };
+bool hasCifSuffix(const QString &fileName, CifSuffix test);
 
-// The lower-cased complete suffix is "cif" exactly: only such files get the oxidation check.
-bool suffixIsCif(const QString &fileName);
+// The name, without directory, of the n-th copy of a CIF file kept before it is rewritten:
+// <base name>_old.cif, then <base name>_old2.cif, _old3.cif, ...
+QString backupFileName(const QString &baseName, int n = 1);
 
-// The name of the backup copy made before a CIF file is rewritten, without directory.
-QString backupFileName(const QString &baseName);
+// True when the name of the chosen file, lower-cased and trimmed, is the staged input's name.
+bool isStagedInputName(const QString &inputFile);
 
 #endif

@@ -1,100 +1,38 @@
 #include "oxidationtable.h"
-#include "linereader.h"
-#include "logstyle.h"
+#include "numbertext.h"
 
-#include <cstring>
-
-namespace {
-const float notFound = 1000.0f;
-
-// Fields of a reduced line: runs of blanks and commas separate, empty parts are skipped.
-QStringList tableFields(const QString &reduced)
-{
-    QStringList fields;
-    qsizetype start = 0;
-    for (qsizetype i = 0; i <= reduced.size(); ++i) {
-        if (i == reduced.size() || reduced.at(i) == QLatin1Char(' ') || reduced.at(i) == QLatin1Char(',')) {
-            if (i > start)
-                fields.append(reduced.mid(start, i - start));
-            start = i + 1;
-        }
-    }
-    return fields;
-}
-
-// The echo line of one entry: name, symbol and charge, two spaces apart.
-QString echoLine(const OxidationEntry &entry, ChargeTexts &charges)
-{
-    return entry.name + QLatin1String("  ") + entry.symbol + QLatin1String("  ") + charges.text(entry.charge);
-}
-} // namespace
-
-QString formatCharge(float charge)
-{
-    return QString::number(double(charge), 'g', 6);
-}
-
-QString ChargeTexts::text(float charge)
-{
-    quint32 bits;
-    std::memcpy(&bits, &charge, sizeof bits);
-    for (const auto &k : known) {
-        if (k.first == bits)
-            return k.second;
-    }
-    QString t = formatCharge(charge);
-    if (known.size() < 32)
-        known.emplace_back(bits, t);
-    return t;
-}
+#include <QIODevice>
+#include <QTextStream>
 
 OxidationTableRead parseOxidationTable(const QString &text)
 {
     OxidationTableRead read;
-    LineReader in(text);
+    QString source = text;
+    QTextStream in(&source, QIODevice::ReadOnly);
     // The end test follows each line, so an empty text still gives one (empty, invalid) line.
     do {
         const QString reduced = in.readLine().simplified().trimmed();
-        const QStringList fields = tableFields(reduced);
+        // Blanks and commas separate; after simplified() the only blank left is the space.
+        const QStringList fields = QString(reduced).replace(QLatin1Char(','), QLatin1Char(' '))
+                                       .split(QLatin1Char(' '), Qt::SkipEmptyParts);
         const qsizetype n = fields.size();
         if (n < 3) {
-            read.log.append(LogStyle::error(QStringLiteral(" Invalid line in \"oxidation.dat\" file! ")));
-            read.log.append(reduced);
-            read.log.append(QStringLiteral("<b> should be of type :  atom_names atom_symbol atom_charge </b><br>"));
+            read.log = {{LogStyle::error(QStringLiteral(" Invalid line in \"oxidation.dat\" file! ")), reduced,
+                         QStringLiteral("<b> should be of type :  atom_names atom_symbol atom_charge </b><br>")}};
             return read;
         }
-        const QString &symbol = fields.at(n - 2);
         const float charge = fields.at(n - 1).toFloat();
         for (qsizetype i = 0; i < n - 2; ++i)
-            read.entries.append(OxidationEntry{fields.at(i), symbol, charge});
+            read.entries.append(OxidationEntry{fields.at(i), fields.at(n - 2), charge});
     } while (!in.atEnd());
 
     read.complete = true;
-    read.log.reserve(read.entries.size() + 1);
-    read.log.append(QStringLiteral("<b>Got the following list of atom symbols and charges :  </b>"));
-    ChargeTexts charges;
-    for (const OxidationEntry &entry : read.entries)
-        read.log.append(echoLine(entry, charges));
+    QStringList echo;
+    echo.reserve(read.entries.size());
+    for (const OxidationEntry &e : std::as_const(read.entries))
+        echo.append(e.name + QLatin1String("  ") + e.symbol + QLatin1String("  ") + realText(e.charge));
+    read.log = {{QStringLiteral("<b>Got the following list of atom symbols and charges :  </b>")}, echo};
     return read;
-}
-
-OxidationEntry firstEntryForName(const QList<OxidationEntry> &table, const QString &key)
-{
-    for (const OxidationEntry &entry : table) {
-        if (entry.name.trimmed() == key)
-            return entry;
-    }
-    return OxidationEntry{QString(), QString(), notFound};
-}
-
-float firstChargeForSymbol(const QList<OxidationEntry> &table, const QString &symbol)
-{
-    const QString wanted = symbol.trimmed();
-    for (const OxidationEntry &entry : table) {
-        if (entry.symbol.trimmed() == wanted)
-            return entry.charge;
-    }
-    return notFound;
 }
 
 OxidationIndex::OxidationIndex(const QList<OxidationEntry> &table)
@@ -102,21 +40,21 @@ OxidationIndex::OxidationIndex(const QList<OxidationEntry> &table)
 {
     firstByName.reserve(table.size());
     firstBySymbol.reserve(table.size());
-    // insert keeps the value already there: the first entry in table order wins.
-    for (qsizetype i = 0; i < table.size(); ++i) {
+    // Filled from the end: a key's first entry in table order is inserted last and stays.
+    for (qsizetype i = table.size() - 1; i >= 0; --i) {
         firstByName.insert(table.at(i).name.trimmed(), i);
         firstBySymbol.insert(table.at(i).symbol.trimmed(), i);
     }
 }
 
-OxidationEntry OxidationIndex::entryForName(QStringView key) const
+OxidationEntry OxidationIndex::entryForName(const QString &key) const
 {
-    const qsizetype i = firstByName.value(key);
-    return i < 0 ? OxidationEntry{QString(), QString(), notFound} : table.at(i);
+    const qsizetype i = firstByName.value(key, -1);
+    return i < 0 ? OxidationEntry() : table.at(i);
 }
 
 float OxidationIndex::chargeForSymbol(const QString &symbol) const
 {
-    const qsizetype i = firstBySymbol.value(symbol.trimmed());
-    return i < 0 ? notFound : table.at(i).charge;
+    const qsizetype i = firstBySymbol.value(symbol.trimmed(), -1);
+    return i < 0 ? OxidationEntry().charge : table.at(i).charge;
 }

@@ -1,6 +1,5 @@
 #include "import.h"
-#include "logbatch.h"
-#include "logstyle.h"
+#include "logwindow.h"
 #include "oxidationtable.h"
 
 #include <QFile>
@@ -17,15 +16,5 @@ void Import::readOxidationTable()
     // Latin-1 keeps every byte, so names match the CIF labels byte for byte.
     OxidationTableRead read = parseOxidationTable(QString::fromLatin1(file.readAll()));
     oxidationTable = std::move(read.entries);
-    appendLogLines(importlog, read.log);
-}
-
-OxidationEntry Import::entryForName(const QString &key) const
-{
-    return firstEntryForName(oxidationTable, key);
-}
-
-float Import::chargeForSymbol(const QString &symbol) const
-{
-    return firstChargeForSymbol(oxidationTable, symbol);
+    appendLogGroups(importlog, read.log);
 }

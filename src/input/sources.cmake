@@ -1,9 +1,9 @@
 list(APPEND MORVEL_INPUT_LOGIC
-  ${CMAKE_CURRENT_LIST_DIR}/linereader.h
-  ${CMAKE_CURRENT_LIST_DIR}/stringindex.h
-  ${CMAKE_CURRENT_LIST_DIR}/stringindex.cpp
+  ${CMAKE_CURRENT_LIST_DIR}/oxidationentry.h
   ${CMAKE_CURRENT_LIST_DIR}/oxidationtable.h
   ${CMAKE_CURRENT_LIST_DIR}/oxidationtable.cpp
+  ${CMAKE_CURRENT_LIST_DIR}/atomtypes.h
+  ${CMAKE_CURRENT_LIST_DIR}/atomtypes.cpp
   ${CMAKE_CURRENT_LIST_DIR}/cifrewrite.h
   ${CMAKE_CURRENT_LIST_DIR}/cifrewrite.cpp
   ${CMAKE_CURRENT_LIST_DIR}/inputpaths.h
@@ -11,7 +11,6 @@ list(APPEND MORVEL_INPUT_LOGIC
   ${CMAKE_CURRENT_LIST_DIR}/filereplace.h
   ${CMAKE_CURRENT_LIST_DIR}/filereplace.cpp)
 list(APPEND MORVEL_INPUT_DIALOG
-  ${CMAKE_CURRENT_LIST_DIR}/oxidationentry.h
   ${CMAKE_CURRENT_LIST_DIR}/getinputfile.cpp
   ${CMAKE_CURRENT_LIST_DIR}/oxidationtablefile.cpp
   ${CMAKE_CURRENT_LIST_DIR}/addoxidationnumbers.cpp)

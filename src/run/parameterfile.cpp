@@ -1,3 +1,4 @@
+#include "filereplace.h"
 #include "import.h"
 #include "logstyle.h"
 #include "runlogic.h"
@@ -5,57 +6,45 @@
 #include <QButtonGroup>
 #include <QFile>
 
-void Import::writeParameterFile()
+bool Import::writeParameterFile()
 {
     importlog->append(QStringLiteral("<br><b> Writing morvel.par file: </b><br>"));
 
-    const QString path = workingDir + QStringLiteral("/morvel.par");
-    if (QFile::exists(path))
-        QFile::remove(path);
-    QFile par(path);
-    // Truncate: where the old file could not be removed (a folder that takes no new files), its
-    // longer text must not outlast the new one.
-    if (!par.open(QIODevice::ReadWrite | QIODevice::Truncate)) {
-        importlog->append(LogStyle::error(
-            QStringLiteral(" Something went wrong while opening a new \"morvel.par\" file! ")));
-        return;
-    }
-
-    dmax = dmaxline->text().toFloat();
-    tolerance = toleranceline->text().toFloat();
-    hbondThreshold = hbondline->text().toFloat();
-    maxVAtoms = maxAtoms->value();
-    inputFormat = InputBox->currentIndex();
-    outputLevel = outputLevelForIndex(OutputBox->currentIndex());
-    polyhedraDetails = checkBoxVerbose->isChecked() ? 1 : 0;
-    printType = printGroup->checkedId();
-
     JobOptions options;
-    options.dmax = dmax;
-    options.tolerance = tolerance;
-    options.hbondThreshold = hbondThreshold;
-    options.maxVAtoms = maxVAtoms;
-    options.inputFormat = inputFormat;
-    options.outputLevel = outputLevel;
-    options.polyhedraDetails = polyhedraDetails;
-    options.printType = printType;
+    // The fields take numbers in the C locale (see the constructor), and QString reads them so.
+    options.dmax = dmaxline->text().toFloat();
+    options.tolerance = toleranceline->text().toFloat();
+    options.hbondThreshold = hbondline->text().toFloat();
+    options.maxVAtoms = maxAtoms->value();
+    options.inputFormat = InputBox->currentIndex();
+    options.outputLevel = outputLevelForIndex(OutputBox->currentIndex());
+    options.polyhedraDetails = checkBoxVerbose->isChecked() ? 1 : 0;
+    options.printType = printGroup->checkedId();
 
-    par.write(parameterLine(options).toLatin1() + '\n');
-    par.flush();
-
+    QByteArray content = parameterLine(options).toLatin1() + '\n';
     // The part file goes into the parameter file as it lies on disk, whatever its encoding.
     QFile partText(QStringLiteral("./morvelpartxt.txt"));
-    if (!partText.open(QIODevice::ReadOnly)) {
-        importlog->append(LogStyle::error(
-            QStringLiteral(" Something went wrong while opening \"morvelpartxt.txt\" file! ")));
-    } else {
-        const QByteArray text = partText.readAll();
-        importlog->append(QString::fromLocal8Bit(text));
-        par.write(' ' + text + '\n');
-        partText.close();
+    const bool partRead = partText.open(QIODevice::ReadOnly);
+    const QByteArray part = partRead ? partText.readAll() : QByteArray();
+    if (partRead)
+        content += ' ' + part + '\n';
+
+    const QString path = workingDir + QStringLiteral("/morvel.par");
+    const WriteResult written = writeNewFile(path, content);
+    if (written == WriteResult::CannotOpen) {
+        importlog->append(LogStyle::error(QStringLiteral(" Something went wrong while opening a new \"morvel.par\" file! ")));
+        return false;
     }
-    par.close();
+    if (partRead)
+        importlog->append(QString::fromLocal8Bit(part));
+    else
+        importlog->append(LogStyle::error(QStringLiteral(" Something went wrong while opening \"morvelpartxt.txt\" file! ")));
+    if (written == WriteResult::CannotWrite) {
+        importlog->append(LogStyle::error(QStringLiteral(" \"morvel.par\" could not be written in full! ")));
+        return false;
+    }
 
     for (const QString &line : jobOptionsEcho(options))
         importlog->append(line);
+    return true;
 }

@@ -1,7 +1,7 @@
 #include "childprocess.h"
 #include "import.h"
+#include "inputpaths.h"
 #include "logstyle.h"
-#include "resultdisplay.h"
 #include "runlogic.h"
 
 #include <QDir>
@@ -10,7 +10,7 @@
 #include <QMessageBox>
 
 namespace {
-// The code outputImport passes on when the converter has printed "ERROR"; never an exit code.
+// What a caller of endImport passes to say that the converter printed "ERROR"; never an exit code.
 const int converterReportedError = -1000;
 
 QString failureLine()
@@ -19,19 +19,13 @@ QString failureLine()
 }
 } // namespace
 
-void Import::updateRunButtons()
-{
-    // No new run may mix with a program of the last one that still runs, and Kill must reach it.
-    const bool busy = programRuns();
-    importButton->setEnabled(!busy);
-    killbutton->setEnabled(busy);
-}
-
 void Import::startChild(QProcess *process, const QString &program, const QStringList &arguments)
 {
     process->setWorkingDirectory(QFileInfo(stagedInputPath).path());
     process->setProgram(resolvedProgramPath(program, QDir::currentPath()));
     process->setArguments(arguments);
+    // Nothing reads the program's other output; discarding it keeps it from piling up.
+    process->setStandardErrorFile(QProcess::nullDevice());
     runInOwnProcessGroup(process);
     process->start();
     // The child's start, or its failure, is reported here and not later from the event loop, so
@@ -39,36 +33,33 @@ void Import::startChild(QProcess *process, const QString &program, const QString
     process->waitForStarted();
 }
 
-bool Import::programRuns() const
-{
-    return importProcess->state() != QProcess::NotRunning
-           || morvelProcess->state() != QProcess::NotRunning;
-}
-
 void Import::makeImport()
 {
-    // Run is disabled while a program runs; this also holds for a click that reaches the slot
-    // some other way.
+    // Run is off while a program runs; this also holds for a click that reaches the slot some
+    // other way.
     if (programRuns()) {
-        updateRunButtons();
+        updateButtons();
         return;
     }
     if (inputFile.isEmpty()) {
         importlog->append(LogStyle::error(QStringLiteral(" Please set Input file before starting ! ")));
-        updateRunButtons();
+        updateButtons();
         return;
     }
 
-    cancelResultDisplay(importlog);
     importlog->clear();
     importError = false;
     converterOutputTail.clear();
 
-    writeParameterFile();
+    // A run never goes on without the job files it needs: no "DONE", no program on stale files.
+    if (!writeParameterFile()) {
+        updateButtons();
+        return;
+    }
 
     const int format = InputBox->currentIndex();
     if (format == 0) {
-        if (!hasCifSuffix(inputFile)) {
+        if (!hasCifSuffix(inputFile, CifSuffix::SuffixIs)) {
             QMessageBox box;
             box.setWindowTitle(QStringLiteral("WARNING!"));
             box.setText(QStringLiteral("The selected file does not have the \".cif\" suffix !"));
@@ -80,30 +71,26 @@ void Import::makeImport()
                 return;
         }
 
-        importButton->setEnabled(false);
-        killbutton->setEnabled(true);
         importlog->append(QStringLiteral("<br><b> Running CIF parser tool ...</b><br>"));
-
-        // Its standard error is not read; discarding it keeps it from piling up in memory.
-        importProcess->setStandardErrorFile(QProcess::nullDevice());
         // The converter gets its two paths as separate arguments, so spaces and quotes in them
         // reach it intact; the log still shows the command as one quoted line.
         startChild(importProcess, parserProgram, {inputFile, stagedInputPath});
         importlog->append(converterCommand(parserProgram, inputFile, stagedInputPath));
-        updateRunButtons();
+        updateButtons();
         return;
     }
 
     if (format == 1 || format == 2) {
         // On a file system that tells case apart, Morvel.In beside morvel.in is another file and
         // has to be copied all the same.
-        const bool isStagedFile = isStagedInputName(inputFile)
-                                  && QFileInfo(inputFile) == QFileInfo(stagedInputPath);
-        if (isStagedFile) {
+        if (isStagedInputName(inputFile) && QFileInfo(inputFile) == QFileInfo(stagedInputPath)) {
             importlog->append(QStringLiteral("<br><b> Input as \"morvel.in\" file </b>"));
         } else {
             importlog->append(QStringLiteral("<br><b>  Copying input file as \"morvel.in\" file </b>"));
-            copyInputFile(inputFile);
+            if (!copyInputFile(inputFile)) {
+                updateButtons();
+                return;
+            }
         }
         endImport(0);
     }
@@ -119,8 +106,17 @@ void Import::outputImport()
     // A flood of output arrives in many deliveries; the word may be cut between two of them.
     if (outputReportsError(importProcess->readAllStandardOutput(), converterOutputTail)) {
         importError = true;
-        endImport(converterReportedError);
+        reportConverterError();
     }
+}
+
+void Import::reportConverterError()
+{
+    importlog->append(LogStyle::error(QStringLiteral(" Something went wrong with Import procedure ! "),
+                                      LogStyle::BreakBefore));
+    importlog->append(LogStyle::error(QStringLiteral(" Please check cifparser.log file."), LogStyle::BreakAfter));
+    // The converter runs on to its own end, which changes nothing more.
+    updateButtons();
 }
 
 void Import::processError(QProcess::ProcessError error)
@@ -128,26 +124,22 @@ void Import::processError(QProcess::ProcessError error)
     importlog->append(QStringLiteral(" error occured : ") + QString::number(int(error)));
     if (!importError)
         importlog->append(failureLine());
-    updateRunButtons();
+    updateButtons();
 }
 
 void Import::endImport(int exitCode)
 {
     if (exitCode == converterReportedError) {
-        importlog->append(QStringLiteral(
-            "<br><b><font color=#FF3300> Something went wrong with Import procedure ! </font></b>"));
-        importlog->append(
-            QStringLiteral("<b><font color=#FF3300> Please check cifparser.log file.</font></b><br>"));
-        updateRunButtons();
+        reportConverterError();
         return;
     }
     if (importError) {
-        updateRunButtons();
+        updateButtons();
         return;
     }
     if (exitCode != 0) {
         importlog->append(failureLine());
-        updateRunButtons();
+        updateButtons();
         return;
     }
 
@@ -165,22 +157,20 @@ void Import::endImport(int exitCode)
             importlog->append(LogStyle::error(QStringLiteral(
                 " The earlier \"MORVEL.OUT\" could not be renamed as \"MORVEL.OUT.old1\" to "
                 "\"MORVEL.OUT.old100\": MORVEL has not been started ! ")));
-            updateRunButtons();
+            updateButtons();
             return;
         }
         importlog->append(QStringLiteral("<b>It has been renamed as :</b>  ") + keptName);
     }
 
-    // Nothing reads the computation program's output; discarding it keeps it from piling up.
     morvelProcess->setStandardOutputFile(QProcess::nullDevice());
-    morvelProcess->setStandardErrorFile(QProcess::nullDevice());
     // The whole value is the program's path, spaces included; the program takes no arguments.
     startChild(morvelProcess, morvelProgram, {});
     if (morvelProcess->state() == QProcess::NotRunning) {
         endMorvel(1);
         return;
     }
-    updateRunButtons();
+    updateButtons();
 }
 
 void Import::killImport()
@@ -190,5 +180,5 @@ void Import::killImport()
     importlog->append(QStringLiteral("<b>Killing Morvel program process</b>"));
     killProgram(morvelProcess);
     // A killed program reports its end through the event loop; the idle state waits for that.
-    updateRunButtons();
+    updateButtons();
 }

@@ -1,19 +1,16 @@
 #include "runlogic.h"
+#include "logstyle.h"
+#include "numbertext.h"
 
 #include <QDir>
 #include <QFile>
 #include <QFileInfo>
 #include <QStandardPaths>
+#include <QStringDecoder>
 
 int outputLevelForIndex(int index)
 {
     return index == 2 ? -1 : index;
-}
-
-QString realText(float value)
-{
-    // QString::number always writes the C locale, and its 'g' drops trailing zeros like printf.
-    return QString::number(double(value), 'g', 6);
 }
 
 QString parameterLine(const JobOptions &o)
@@ -64,16 +61,6 @@ bool outputReportsError(const QByteArray &delivery, QByteArray &carry)
     return joined.contains(word);
 }
 
-bool isStagedInputName(const QString &inputFile)
-{
-    return QFileInfo(inputFile).fileName().toLower().trimmed() == QLatin1String("morvel.in");
-}
-
-bool hasCifSuffix(const QString &inputFile)
-{
-    return QFileInfo(inputFile).suffix().toLower() == QLatin1String("cif");
-}
-
 QString keptResultName(int n)
 {
     return QStringLiteral("/MORVEL.OUT.old") + QString::number(n);
@@ -119,4 +106,32 @@ QString textEditorProgram()
     if (QFileInfo::exists(notepad))
         return notepad;
     return QStandardPaths::findExecutable(QStringLiteral("xdg-open"));
+}
+
+ResultText readResultText(QIODevice &file, qint64 limit)
+{
+    ResultText result;
+    result.fileSize = file.size();
+    result.whole = result.fileSize <= limit;
+    const QByteArray bytes = file.read(limit);
+    const auto bom = QStringConverter::encodingForData(bytes);
+    // A stateless decoder turns a sequence cut by the end of the file into U+FFFD; a stateful one
+    // keeps it back, which is right where the bytes stop at the limit.
+    QStringDecoder decoder(bom ? *bom : QStringConverter::Utf8,
+                           result.whole ? QStringConverter::Flag::Stateless : QStringConverter::Flag::Default);
+    result.text = decoder.decode(bytes);
+    result.text.replace(QChar(0), QChar::ReplacementCharacter);
+    if (!result.whole) {
+        const qsizetype lineEnd = result.text.lastIndexOf(QLatin1Char('\n'));
+        if (lineEnd > 0)
+            result.text.truncate(result.text.at(lineEnd - 1) == QLatin1Char('\r') ? lineEnd - 1 : lineEnd);
+    }
+    return result;
+}
+
+QString resultTooLargeLine(qint64 fileSize)
+{
+    return LogStyle::error(QStringLiteral(" The result is larger than the log shows (%1 bytes): open \"MORVEL.OUT\" "
+                                          "with \"Open in editor\" to read all of it. ")
+                               .arg(fileSize));
 }

@@ -2,6 +2,7 @@
 #define MORVEL_RUNLOGIC_H
 
 #include <QByteArray>
+#include <QIODevice>
 #include <QString>
 #include <QStringList>
 
@@ -23,9 +24,6 @@ struct JobOptions
 // OUTPUT as the computation program wants it: the third choice (ionic radii tables) is -1.
 int outputLevelForIndex(int index);
 
-// A real number as the job files and the log show it: C locale, %g with six significant digits.
-QString realText(float value);
-
 // Line 1 of morvel.par, without its line end: eleven right-aligned fields, never cut.
 QString parameterLine(const JobOptions &options);
 
@@ -41,12 +39,6 @@ QString converterCommand(const QString &parserProgram, const QString &inputFile,
 // between two deliveries is seen too, and a word is never counted twice.
 bool outputReportsError(const QByteArray &delivery, QByteArray &carry);
 
-// True when the name of the chosen file, lower-cased and trimmed, is the staged input's name.
-bool isStagedInputName(const QString &inputFile);
-
-// True when the file name ends in ".cif", in any mix of cases.
-bool hasCifSuffix(const QString &inputFile);
-
 // "/MORVEL.OUT.old" followed by n: the name an earlier result is kept under.
 QString keptResultName(int n);
 
@@ -56,6 +48,27 @@ QString takeKeptResultName(const std::function<bool(const QString &name)> &tryRe
 
 // The five banner lines above the result file in the log.
 QStringList resultBanner();
+
+// Of a result file larger than this, the log shows only the beginning: one append of a larger
+// text keeps the window from answering for too long (bench/resultdisplay measures it).
+constexpr qint64 resultLogLimit = 1024 * 1024;
+
+// A result file's text as the log shows it. The bytes are read as a text stream reads them:
+// UTF-8 unless a byte-order mark names another Unicode encoding (the mark itself is dropped), and
+// invalid sequences and NUL bytes become U+FFFD, so that binary bytes neither end the text nor
+// reach the log as control characters. Of a file larger than limit, only the beginning, cut at
+// the end of its last whole line.
+struct ResultText
+{
+    QString text;
+    qint64 fileSize = 0;
+    bool whole = true;
+};
+
+ResultText readResultText(QIODevice &file, qint64 limit = resultLogLimit);
+
+// The log line that follows a result shown only in part.
+QString resultTooLargeLine(qint64 fileSize);
 
 // Where a program path given relative to the binaries directory really lies. The child runs in
 // the working directory, so a relative path must not be left for the child to resolve.
