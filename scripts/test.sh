@@ -4,18 +4,16 @@
 #   MORVEL_FUZZ_SECONDS   seconds per fuzzer (default 60)
 set -euo pipefail
 root=$(cd "$(dirname "$0")/.." && pwd)
-bash "$root/scripts/deps.sh" clang libclang-rt-14-dev gdb
+bash "$root/scripts/deps.sh" clang libclang-rt-14-dev gdb xvfb xdotool imagemagick
 jobs=$(nproc 2>/dev/null || echo 2)
 export QT_QPA_PLATFORM=offscreen
 stages=0
 
-# A test that fails is run once more (--repeat until-pass:2): an intermittent hang of a whole-job
-# test was seen once in many runs and could not be reproduced since; a second failure fails the run.
 echo "== plain build and tests"
 plain=${MORVEL_BUILD_DIR:-$root/build}
 cmake -S "$root" -B "$plain" -DCMAKE_BUILD_TYPE=RelWithDebInfo -DMORVEL_BUILD_TESTS=ON
 cmake --build "$plain" -j"$jobs"
-(cd "$plain" && ctest --output-on-failure -j"$jobs" --repeat until-pass:2)
+(cd "$plain" && ctest --output-on-failure -j"$jobs")
 stages=$((stages + 1))
 
 echo "== sanitized build and tests"
@@ -29,7 +27,7 @@ cmake --build "$sanitized" -j"$jobs"
 (cd "$sanitized" &&
  ASAN_OPTIONS="log_path=$reports/asan:detect_leaks=1:strict_string_checks=1" \
  UBSAN_OPTIONS="log_path=$reports/ubsan:print_stacktrace=1:halt_on_error=1" \
- ctest --output-on-failure -j"$jobs" --repeat until-pass:2)
+ ctest --output-on-failure -j"$jobs" -LE desktop)
 if compgen -G "$reports/*" > /dev/null; then
   echo "Sanitizer reports:"
   cat "$reports"/*
