@@ -32,11 +32,10 @@ inline QByteArray readFile(const QString &path)
 // The log as the user reads it: its non-empty lines, trimmed.
 inline QStringList logLines(const QTextEdit *log)
 {
-    QStringList lines;
-    for (const QString &line : log->toPlainText().split(QLatin1Char('\n'))) {
-        if (!line.trimmed().isEmpty())
-            lines.append(line.trimmed());
-    }
+    QStringList lines = log->toPlainText().split(QLatin1Char('\n'));
+    for (QString &line : lines)
+        line = line.trimmed();
+    lines.removeAll(QString());
     return lines;
 }
 
@@ -70,16 +69,14 @@ public:
         });
     }
 
-    // The next message box: run before (if any), then press button.
-    void answerBox(QMessageBox::StandardButton button, std::function<void()> before = {})
+    // The next message box: press button.
+    void answerBox(QMessageBox::StandardButton button)
     {
-        steps.append([this, button, before](QWidget *w) {
+        steps.append([this, button](QWidget *w) {
             auto *box = qobject_cast<QMessageBox *>(w);
             if (!box || !box->button(button))
                 return unexpected(w);
             seen.append(box->windowTitle() + " | " + box->text() + " | " + box->informativeText());
-            if (before)
-                before();
             box->button(button)->click();
         });
     }

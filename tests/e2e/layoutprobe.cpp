@@ -1,9 +1,6 @@
-// Prints where the controls a demo job needs lie inside the MorvelGUI window, one line each:
-//   window <width> <height>
-//   <objectName> <x> <y>      (centre, in window coordinates)
-// It builds the window as the program's main() does and shows it on the same display, so the
-// layout (fonts, DPI, style) is the one the real program gets there. scripts/desktop-check.sh
-// clicks these points with xdotool.
+// Prints where the controls a demo job needs lie in the MorvelGUI window ("window <width> <height>",
+// then "<objectName> <x> <y>" of each centre), laid out as main() does it on this display, for
+// scripts/desktop-check.sh to click with xdotool.
 #include "import.h"
 
 #include <QApplication>
@@ -18,12 +15,9 @@ int main(int argc, char *argv[])
     dialog.setWindowFlags(Qt::Window);
     dialog.resize(dialog.size().expandedTo(dialog.sizeHint()));
     dialog.show();
-
     QTimer::singleShot(200, &app, [&] {
         std::printf("window %d %d\n", dialog.width(), dialog.height());
-        const QList<QWidget *> controls{dialog.browseinput, dialog.importButton, dialog.InputBox,
-                                        dialog.importlog};
-        for (QWidget *w : controls) {
+        for (QWidget *w : std::initializer_list<QWidget *>{dialog.browseinput, dialog.importButton, dialog.InputBox, dialog.importlog}) {
             const QPoint centre = w->mapTo(&dialog, w->rect().center());
             std::printf("%s %d %d\n", qPrintable(w->objectName()), centre.x(), centre.y());
         }
