@@ -3,18 +3,10 @@
 // Build and run: see fuzz/CMakeLists.txt.
 #include "cifrewrite.h"
 #include "oxidationtable.h"
+#include "require.h"
 
 #include <cstdint>
-#include <cstdlib>
 #include <cstring>
-
-namespace {
-void require(bool condition)
-{
-    if (!condition)
-        std::abort();
-}
-} // namespace
 
 extern "C" int LLVMFuzzerTestOneInput(const uint8_t *data, size_t size)
 {

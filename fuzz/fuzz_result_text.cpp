@@ -1,21 +1,13 @@
 // Fuzzes how the log reads a result file: any bytes, cut at any limit.
 // The input's first two bytes give the limit (0 to 65535); the rest is the file.
 // Build and run: see fuzz/CMakeLists.txt.
+#include "require.h"
 #include "runlogic.h"
 
 #include <QBuffer>
 #include <QStringDecoder>
 
 #include <cstdint>
-#include <cstdlib>
-
-namespace {
-void require(bool condition)
-{
-    if (!condition)
-        std::abort();
-}
-} // namespace
 
 extern "C" int LLVMFuzzerTestOneInput(const uint8_t *data, size_t size)
 {

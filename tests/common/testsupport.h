@@ -69,7 +69,6 @@ public:
         });
     }
 
-    // The next message box: press button.
     void answerBox(QMessageBox::StandardButton button)
     {
         steps.append([this, button](QWidget *w) {
