@@ -51,7 +51,7 @@ QStringList resultBanner();
 
 // Of a result file larger than this, the log shows only the beginning: one append of a larger
 // text keeps the window from answering for too long (bench/resultdisplay measures it).
-constexpr qint64 resultLogLimit = 1024 * 1024;
+constexpr qint64 resultLogLimit = 512 * 1024;
 
 // A result file's text as the log shows it. The bytes are read as a text stream reads them:
 // UTF-8 unless a byte-order mark names another Unicode encoding (the mark itself is dropped), and
