@@ -182,20 +182,19 @@ private slots:
 
     void longListsKeepTheirHeadings()
     {
-        // Each group is shortened on its own: headings and closing lines all stay.
-        QStringList known, unknown;
-        for (int i = 0; i < 7000; ++i)
-            known.append("known " + QString::number(i));
-        for (int i = 0; i < 12000; ++i)
-            unknown.append("unknown " + QString::number(i));
+        // 7,000 atoms the table knows (by their type symbol) and 12,000 it does not: each list is
+        // shortened on its own, and every heading stays.
+        QString cif = QString::fromLatin1(tags);
+        for (int i = 0; i < 19000; ++i)
+            cif += (i < 7000 ? "K" : "U") + QString::number(i) + (i < 7000 ? " K 0\n" : " U 0\n");
         QTextEdit log;
-        appendLogGroups(&log, {{"heading"}, known, {"WARNING"}, unknown, {"closing"}});
+        appendLogGroups(&log, rewriteCifText(cif, OxidationIndex({{"K", "K+", 1}})).log);
         const QStringList lines = logLines(&log);
-        QCOMPARE(lines.size(), 3 + 7000 + logGroupLimit + 1);
-        QCOMPARE(lines.mid(7000, 3), (QStringList{"known 6999", "WARNING", "unknown 0"}));
-        QCOMPARE(lines.mid(7002 + 4999, 3),
-                 (QStringList{"unknown 4999", "2000 more lines are not shown in the log.", "unknown 7000"}));
-        QCOMPARE(lines.mid(lines.size() - 2), (QStringList{"unknown 11999", "closing"}));
+        QCOMPARE(lines.size(), 1 + 7000 + 2 + logGroupLimit + 1);
+        QCOMPARE(lines.mid(7000, 4), QStringList({"Atom K6999 has symbol K+ and charge 1", "WARNING !",
+                                                  "The following atoms do not have any match in \"oxidation.dat\" file :", "U7000"}));
+        QCOMPARE(lines.mid(7003 + 4999, 3), (QStringList{"U11999", "2000 more lines are not shown in the log.", "U14000"}));
+        QCOMPARE(lines.constLast(), "U18999");
     }
 
     void parameterLine()
