@@ -208,7 +208,11 @@ sleep 0.7
 shot_end=${shot%.png}-log-end.png
 import -window root "$shot_end"
 step "screenshot, log scrolled to its end: $shot_end"
-[ -f "$work/${input%%.*}_old.cif" ] && echo "completed from oxidation.dat; original kept as ${input%%.*}_old.cif"
+# A CIF file without oxidation numbers must have brought the question, and OK the completion.
+if [ "$format" = cif ] && ! grep -q _atom_type_oxidation_number "$root/demo/$input"; then
+  [ -f "$work/${input%%.*}_old.cif" ] || fail "no oxidation-number question was answered: no ${input%%.*}_old.cif"
+  echo "completed from oxidation.dat; original kept as ${input%%.*}_old.cif"
+fi
 echo "result (MORVEL.OUT), first site:"
 awk '/^Interatomic distances/ { on = 1 } on && /Coordination number/ { print; exit } on' "$work/MORVEL.OUT" | head -n 20
 echo "desktop check passed: $input, $([ "$open_with" = 1 ] && echo "opened with the entry's %f" || echo "chosen with Browse")"
