@@ -120,15 +120,25 @@ resolved=$(command -v "${exec_cmd[0]}") || fail "Exec= command ${exec_cmd[0]} no
 [ "$resolved" = "$prefix/bin/MorvelGUI" ] || fail "Exec= command resolves to $resolved, not the installed program"
 
 step "virtual display"
-Xvfb -displayfd 3 -screen 0 1280x1024x24 -nolisten tcp 3>"$tmp/display" >"$tmp/xvfb.log" 2>&1 &
+# -noreset: by default the server resets when its last client (the layout probe below) leaves, and a
+# program that connects during the reset is refused ("could not connect to display").
+Xvfb -displayfd 3 -screen 0 1280x1024x24 -nolisten tcp -noreset 3>"$tmp/display" >"$tmp/xvfb.log" 2>&1 &
 xvfb_pid=$!
 display=$(wait_for 100 cat "$tmp/display") || fail "Xvfb did not start: $(cat "$tmp/xvfb.log")"
 export DISPLAY=":$display"
 unset WAYLAND_DISPLAY QT_QPA_PLATFORM
+display_state() {
+  if kill -0 "$xvfb_pid" 2>/dev/null; then echo "Xvfb on $DISPLAY runs; its log: $(tail -n 5 "$tmp/xvfb.log")"
+  else echo "Xvfb on $DISPLAY has exited; its log: $(tail -n 5 "$tmp/xvfb.log")"; fi
+}
+display_answers() { xdotool getdisplaygeometry; }
+wait_for 100 display_answers >/dev/null || fail "the display does not answer. $(display_state)"
 
 # Where the controls lie in the window, on this display with its fonts (the probe builds the same
 # window and quits before the program starts).
-layout=$(cd "$start_dir" && "$build/tests/e2e/e2e_layout_probe" 2>/dev/null) || fail "layout probe failed"
+layout=$(cd "$start_dir" && "$build/tests/e2e/e2e_layout_probe" 2>"$tmp/probe.log") \
+  || fail "layout probe failed: $(cat "$tmp/probe.log"). $(display_state)"
+wait_for 100 display_answers >/dev/null || fail "the display no longer answers after the probe. $(display_state)"
 at() { awk -v n="$1" '$1 == n { print $2, $3 }' <<<"$layout"; }
 read -r browse_x browse_y <<<"$(at browseinput)"
 read -r run_x run_y <<<"$(at importButton)"
@@ -138,7 +148,7 @@ read -r probe_w probe_h <<<"$(at window)"
 step "start: ${exec_cmd[*]} (the installed entry's Exec=) in $start_dir"
 (cd "$start_dir" && exec "${exec_cmd[@]}") >"$tmp/app.log" 2>&1 &
 app_pid=$!
-wid=$(wait_for 100 visible_window '^MorvelGUI$') || fail "no MorvelGUI window: $(cat "$tmp/app.log")"
+wid=$(wait_for 100 visible_window '^MorvelGUI$') || fail "no MorvelGUI window: $(cat "$tmp/app.log"). $(display_state)"
 eval "$(xdotool getwindowgeometry --shell "$wid")"
 [ "$WIDTH" = "$probe_w" ] && [ "$HEIGHT" = "$probe_h" ] \
   || fail "window is ${WIDTH}x$HEIGHT but the probe laid it out as ${probe_w}x$probe_h"
